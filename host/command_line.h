@@ -1,0 +1,39 @@
+// The vtpl-host command line: a subcommand and its options.
+#ifndef VTPL_HOST_COMMAND_LINE_H
+#define VTPL_HOST_COMMAND_LINE_H
+
+#include <cstdint>
+#include <filesystem>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "host_error.h"
+
+namespace vtpl::host {
+
+// A command line that cannot be understood; the tool prints it with the usage text.
+class UsageError : public HostError {
+ public:
+  using HostError::HostError;
+};
+
+struct CommandLine {
+  std::string command;           // "info" or "help"
+  std::filesystem::path plugin;  // empty: the module built beside the tool
+  bool trace = false;            // log every message and callback to standard error
+  bool verbose = false;          // set the host record's verbose flag
+  std::vector<std::pair<std::string, std::string>> settings;  // --set id=value, in order
+  std::optional<int32_t> hostVersion;
+  std::optional<std::string> hostIdentifier;
+};
+
+// Throws UsageError.
+CommandLine parseCommandLine(const std::vector<std::string>& arguments);
+
+std::string usageText();
+
+}  // namespace vtpl::host
+
+#endif  // VTPL_HOST_COMMAND_LINE_H

@@ -1,0 +1,144 @@
+#include "effect_host.h"
+
+#include <stdexcept>
+
+#include "host_callbacks.h"
+#include "host_error.h"
+
+namespace vtpl::host {
+
+namespace {
+constexpr char kParentLayerName[] = "Effect_Parent_Layer";
+}
+
+EffectHost::EffectHost(const PluginModule& module, HostSettings settings, std::ostream* trace)
+    : module_(module), settings_(std::move(settings)), trace_(trace) {
+  record_.verbose = settings_.verbose ? 1 : 0;
+  installCallbacks(record_);
+}
+
+EffectHost::~EffectHost() {
+  close();
+}
+
+void EffectHost::open() {
+  try {
+    expectHandled(kMessageCreateSharedData, send(kMessageCreateSharedData), "create shared data");
+    expectHandled(kMessageCreateInstance, send(kMessageCreateInstance), "create its instance");
+    if (record_.instance == nullptr) {
+      throw HostError("the effect did not create its instance");
+    }
+    expectHandled(kMessageDeclareParameters, send(kMessageDeclareParameters),
+                  "declare its parameters");
+    if (store_.openGroupCount() != 0) {
+      throw HostError("the effect left " + std::to_string(store_.openGroupCount()) +
+                      " parameter group(s) open");
+    }
+    if (settings_.announceInitialValues) {
+      for (const Parameter& parameter : std::vector<Parameter>(store_.parameters())) {
+        const std::string& id = parameter.declaration.id;
+        expectHandled(kMessageParameterChanged, changeParameter(id), "react to '" + id + "'");
+      }
+    }
+  } catch (...) {
+    close();
+    throw;
+  }
+}
+
+void EffectHost::close() noexcept {
+  if (record_.instance != nullptr) {
+    send(kMessageDestroyInstance);
+  }
+  if (record_.sharedData != nullptr) {
+    send(kMessageDestroySharedData);
+  }
+}
+
+int32_t EffectHost::send(int32_t message) {
+  return sendWithDetail(message, "");
+}
+
+int32_t EffectHost::sendWithDetail(int32_t message, const std::string& detail) {
+  trace_.messageSent(message, detail);
+  const int32_t result = module_.notifyEntry()(this, &record_, message);
+  trace_.messageAnswered(message, result);
+  return result;
+}
+
+int32_t EffectHost::changeParameter(const std::string& id) {
+  return sendNamingParameter(kMessageParameterChanged, id);
+}
+
+int32_t EffectHost::editParameter(const std::string& id, int32_t message) {
+  return sendNamingParameter(message, id);
+}
+
+int32_t EffectHost::sendNamingParameter(int32_t message, const std::string& id) {
+  changedId_ = id;
+  changed_.id = changedId_.c_str();
+  record_.changed = &changed_;
+  const int32_t result = sendWithDetail(message, inQuotes(id));
+  record_.changed = nullptr;
+  return result;
+}
+
+int32_t EffectHost::changeParentLayer(int32_t width, int32_t height) {
+  auto layer = std::make_unique<HostLayer>();
+  layer->info.frameCount = 1;
+  layer->info.width = width;
+  layer->info.height = height;
+  layerReference_ = HostLayerReference{};
+  layerReference_.layer = layer.get();
+  layers_.push_back(std::move(layer));
+  record_.messageRecord = &layerReference_;
+  const int32_t result = changeParameter(kParentLayerName);
+  record_.messageRecord = nullptr;
+  return result;
+}
+
+void EffectHost::setValueFromText(const std::string& id, const std::string& text) {
+  store_.setFromText(id, text);
+  expectHandled(kMessageParameterChanged, changeParameter(id), "react to '" + id + "'");
+  expectHandled(kMessageParameterEdited, editParameter(id), "take the edit of '" + id + "'");
+}
+
+void EffectHost::expectHandled(int32_t message, int32_t result, const std::string& what) {
+  if (result != kResultHandled) {
+    throw HostError("the effect failed to " + what + " (Notify " + std::to_string(message) +
+                    " returned " + std::to_string(result) + ")");
+  }
+}
+
+void EffectHost::enterCallback(std::string_view name) {
+  ++callbackCount_;
+  if (name != faults_.throwInCallback) {
+    return;
+  }
+  if (faults_.throwNonStandard) {
+    throw 42;
+  }
+  throw std::runtime_error("host fault injected in " + std::string(name));
+}
+
+int32_t EffectHost::declareParameter(ParameterDeclaration declaration) {
+  if (++declarationsSeen_ == faults_.rejectDeclaration) {
+    return kDeclarationRefused;
+  }
+  return store_.declare(std::move(declaration));
+}
+
+void EffectHost::noteUnknownId(const char* id) {
+  unknownIds_.push_back(id != nullptr ? id : "(null)");
+}
+
+const HostLayer* EffectHost::findLayer(const void* handle) const {
+  for (const auto& layer : layers_) {
+    if (layer.get() == handle) {
+      return layer.get();
+    }
+  }
+  return nullptr;
+}
+
+}  // namespace vtpl::host

@@ -1,0 +1,108 @@
+// One effect instance as the editor drives it: the host record with its callback table, the
+// parameter panel, and the messages of the effect's life (3, 0, 2, ..., 1, 4).
+#ifndef VTPL_HOST_EFFECT_HOST_H
+#define VTPL_HOST_EFFECT_HOST_H
+
+#include <cstdint>
+#include <memory>
+#include <ostream>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "parameter_store.h"
+#include "plugin_module.h"
+#include "trace_log.h"
+#include "vtpl/host_interface.h"
+
+namespace vtpl::host {
+
+struct HostSettings {
+  std::u16string identifier = u"com.vantric.Vantric";
+  int32_t version = 5600;
+  bool verbose = false;
+  // After the declarations, report every parameter once as changed, as the editor does when it
+  // opens an effect, so that the effect can set the panel's initial visibility.
+  bool announceInitialValues = true;
+};
+
+// Faults the host commits on request, so tests can see how an effect copes with a bad host.
+struct HostFaults {
+  int rejectDeclaration = 0;      // refuse the Nth parameter declaration (1-based); 0: none
+  std::string throwInCallback;    // throw from the callback of this name (as the trace names it)
+  bool throwNonStandard = false;  // throw an int instead of a std::runtime_error
+  bool failLayerInfo = false;     // getLayerInfo answers with a failure status
+};
+
+// A layer the host can report to the effect (message 7 with "Effect_Parent_Layer").
+struct HostLayer {
+  HostLayerInfo info{};
+};
+
+class EffectHost {
+ public:
+  explicit EffectHost(const PluginModule& module, HostSettings settings = {},
+                      std::ostream* trace = nullptr);
+  ~EffectHost();  // closes
+  EffectHost(const EffectHost&) = delete;
+  EffectHost& operator=(const EffectHost&) = delete;
+
+  // Messages 3, 0 and 2 (and the initial announcements). Throws HostError naming the message
+  // that failed, after closing again.
+  void open();
+  // Message 1 while the instance slot is set, then message 4 while the shared slot is set.
+  void close() noexcept;
+
+  // Sends one message with the record as it stands.
+  int32_t send(int32_t message);
+  // Message 7 for `id`.
+  int32_t changeParameter(const std::string& id);
+  // Message 13 or 14 for `id`.
+  int32_t editParameter(const std::string& id, int32_t message = kMessageParameterEdited);
+  // Message 7 "Effect_Parent_Layer" with a layer of this size.
+  int32_t changeParentLayer(int32_t width, int32_t height);
+  // A user's edit: the value from text, then messages 7 and 13. Throws HostError.
+  void setValueFromText(const std::string& id, const std::string& text);
+
+  HostEffectRecord& record() { return record_; }
+  ParameterStore& parameters() { return store_; }
+  const HostSettings& settings() const { return settings_; }
+  HostFaults& faults() { return faults_; }
+  TraceLog& trace() { return trace_; }
+
+  // What the callbacks saw.
+  const std::vector<std::string>& unknownParameterIds() const { return unknownIds_; }
+  int redrawRequests() const { return redrawRequests_; }
+  int callbackCount() const { return callbackCount_; }
+
+  // Bookkeeping for the callback table.
+  void enterCallback(std::string_view name);  // counts; commits an injected throw
+  int32_t declareParameter(ParameterDeclaration declaration);
+  void noteUnknownId(const char* id);
+  void noteRedraw() { ++redrawRequests_; }
+  const HostLayer* findLayer(const void* handle) const;
+
+ private:
+  int32_t sendWithDetail(int32_t message, const std::string& detail);
+  int32_t sendNamingParameter(int32_t message, const std::string& id);
+  void expectHandled(int32_t message, int32_t result, const std::string& what);
+
+  const PluginModule& module_;
+  HostSettings settings_;
+  HostFaults faults_;
+  TraceLog trace_;
+  ParameterStore store_;
+  HostEffectRecord record_{};
+  HostChangedParameter changed_{};
+  std::string changedId_;
+  HostLayerReference layerReference_{};
+  std::vector<std::unique_ptr<HostLayer>> layers_;
+  std::vector<std::string> unknownIds_;
+  int declarationsSeen_ = 0;
+  int redrawRequests_ = 0;
+  int callbackCount_ = 0;
+};
+
+}  // namespace vtpl::host
+
+#endif  // VTPL_HOST_EFFECT_HOST_H

@@ -1,0 +1,420 @@
+#include "host_callbacks.h"
+
+#include <cstdio>
+#include <cstring>
+
+#include "effect_host.h"
+
+namespace vtpl::host {
+namespace {
+
+// Written by getLayer when no layer is chosen.
+constexpr char kNoLayerIdentifier[] = "00000000-0000-0000-0000-000000000000";
+
+EffectHost& hostOf(HostContext context) {
+  return *static_cast<EffectHost*>(context);
+}
+
+std::string number(double value) {
+  char text[32];
+  std::snprintf(text, sizeof text, "%g", value);
+  return text;
+}
+
+std::u16string textOrEmpty(const char16_t* text) {
+  return text != nullptr ? text : u"";
+}
+
+// ---- declarations -------------------------------------------------------------------------
+
+ParameterDeclaration declaration(ParameterKind kind, const char16_t* label, const char* id,
+                                 uint32_t flags) {
+  ParameterDeclaration result;
+  result.kind = kind;
+  result.label = textOrEmpty(label);
+  result.id = id != nullptr ? id : "";
+  result.flags = flags;
+  return result;
+}
+
+std::string commonArguments(const char16_t* label, const char* id, uint32_t flags) {
+  return "label=" + inQuotes(std::u16string_view(textOrEmpty(label))) + ", id=" + inQuotes(id) +
+         ", flags=" + hex(flags);
+}
+
+int32_t finishDeclaration(EffectHost& host, std::string_view name, ParameterDeclaration d,
+                          const std::string& arguments) {
+  const int32_t status = host.declareParameter(std::move(d));
+  host.trace().callback(name, arguments, std::to_string(status));
+  return status;
+}
+
+std::vector<ChoiceEntry> choiceEntries(const char16_t* items, const int32_t* values) {
+  std::vector<ChoiceEntry> entries;
+  const std::u16string list = textOrEmpty(items);
+  if (list.empty()) {
+    return entries;
+  }
+  size_t start = 0;
+  for (;;) {
+    const size_t bar = list.find(u'|', start);
+    entries.push_back({list.substr(start, bar - start), 0});
+    if (bar == std::u16string::npos) {
+      break;
+    }
+    start = bar + 1;
+  }
+  for (size_t i = 0; i < entries.size(); ++i) {
+    entries[i].value = values != nullptr ? values[i] : static_cast<int32_t>(i);
+  }
+  return entries;
+}
+
+const char16_t* hostIdentifier(HostContext context) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("hostIdentifier");
+  const std::u16string& identifier = host.settings().identifier;
+  host.trace().callback("hostIdentifier", "", inQuotes(std::u16string_view(identifier)));
+  return identifier.c_str();
+}
+
+int32_t hostVersion(HostContext context) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("hostVersion");
+  host.trace().callback("hostVersion", "", std::to_string(host.settings().version));
+  return host.settings().version;
+}
+
+int32_t beginGroup(HostContext context, const char16_t* label) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("beginGroup");
+  const int32_t status = host.parameters().beginGroup(textOrEmpty(label));
+  host.trace().callback("beginGroup", inQuotes(std::u16string_view(textOrEmpty(label))),
+                        std::to_string(status));
+  return status;
+}
+
+int32_t endGroup(HostContext context) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("endGroup");
+  const int32_t status = host.parameters().endGroup();
+  host.trace().callback("endGroup", "", std::to_string(status));
+  return status;
+}
+
+int32_t defineFloat(HostContext context, const char16_t* label, const char16_t* unit,
+                    const char* id, uint32_t flags, float min, float max, float defaultValue,
+                    int32_t decimals) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("defineFloat");
+  ParameterDeclaration d = declaration(ParameterKind::Float, label, id, flags);
+  d.unit = textOrEmpty(unit);
+  d.min = min;
+  d.max = max;
+  d.defaults[0] = defaultValue;
+  d.decimals = decimals;
+  const std::string arguments =
+      commonArguments(label, id, flags) + ", unit=" + inQuotes(std::u16string_view(d.unit)) +
+      ", min=" + number(min) + ", max=" + number(max) + ", default=" + number(defaultValue) +
+      ", decimals=" + std::to_string(decimals);
+  return finishDeclaration(host, "defineFloat", std::move(d), arguments);
+}
+
+int32_t defineSlider(HostContext context, const char16_t* label, const char16_t* unit,
+                     const char* id, uint32_t flags, float min, float max, float sliderMin,
+                     float sliderMax, float defaultValue, int32_t decimals) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("defineSlider");
+  ParameterDeclaration d = declaration(ParameterKind::Slider, label, id, flags);
+  d.unit = textOrEmpty(unit);
+  d.min = min;
+  d.max = max;
+  d.sliderMin = sliderMin;
+  d.sliderMax = sliderMax;
+  d.defaults[0] = defaultValue;
+  d.decimals = decimals;
+  const std::string arguments =
+      commonArguments(label, id, flags) + ", unit=" + inQuotes(std::u16string_view(d.unit)) +
+      ", min=" + number(min) + ", max=" + number(max) + ", sliderMin=" + number(sliderMin) +
+      ", sliderMax=" + number(sliderMax) + ", default=" + number(defaultValue) +
+      ", decimals=" + std::to_string(decimals);
+  return finishDeclaration(host, "defineSlider", std::move(d), arguments);
+}
+
+int32_t defineBool(HostContext context, const char16_t* label, const char* id, uint32_t flags,
+                   uint8_t defaultValue) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("defineBool");
+  ParameterDeclaration d = declaration(ParameterKind::Bool, label, id, flags);
+  d.defaults[0] = defaultValue != 0 ? 1 : 0;
+  const std::string arguments =
+      commonArguments(label, id, flags) + ", default=" + std::to_string(defaultValue);
+  return finishDeclaration(host, "defineBool", std::move(d), arguments);
+}
+
+int32_t defineChoice(HostContext context, const char16_t* label, const char* id, uint32_t flags,
+                     const char16_t* items, const int32_t* values, int32_t defaultIndex) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("defineChoice");
+  ParameterDeclaration d = declaration(ParameterKind::Choice, label, id, flags);
+  d.choices = choiceEntries(items, values);
+  d.defaults[0] = defaultIndex;
+  std::string valueList;
+  for (const ChoiceEntry& entry : d.choices) {
+    valueList += (valueList.empty() ? "" : ",") + std::to_string(entry.value);
+  }
+  const std::string arguments = commonArguments(label, id, flags) +
+                                ", items=" + inQuotes(std::u16string_view(textOrEmpty(items))) +
+                                ", values=[" + valueList +
+                                "], default=" + std::to_string(defaultIndex);
+  return finishDeclaration(host, "defineChoice", std::move(d), arguments);
+}
+
+int32_t definePoint(HostContext context, const char16_t* label, const char* id, uint32_t flags,
+                    float x, float y) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("definePoint");
+  ParameterDeclaration d = declaration(ParameterKind::Point, label, id, flags);
+  d.defaults = {x, y, 0};
+  const std::string arguments =
+      commonArguments(label, id, flags) + ", default=(" + number(x) + ", " + number(y) + ")";
+  return finishDeclaration(host, "definePoint", std::move(d), arguments);
+}
+
+int32_t defineAngle(HostContext context, const char16_t* label, const char* id, uint32_t flags,
+                    uint8_t option, float degrees) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("defineAngle");
+  ParameterDeclaration d = declaration(ParameterKind::Angle, label, id, flags);
+  d.angleOption = option;
+  d.defaults[0] = degrees;
+  const std::string arguments = commonArguments(label, id, flags) +
+                                ", option=" + std::to_string(option) +
+                                ", default=" + number(degrees);
+  return finishDeclaration(host, "defineAngle", std::move(d), arguments);
+}
+
+int32_t defineColor(HostContext context, const char16_t* label, const char* id, uint32_t flags,
+                    float red, float green, float blue) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("defineColor");
+  ParameterDeclaration d = declaration(ParameterKind::Color, label, id, flags);
+  d.defaults = {red, green, blue};
+  const std::string arguments = commonArguments(label, id, flags) + ", default=(" + number(red) +
+                                ", " + number(green) + ", " + number(blue) + ")";
+  return finishDeclaration(host, "defineColor", std::move(d), arguments);
+}
+
+int32_t defineLayer(HostContext context, const char16_t* label, const char* id, uint32_t flags) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("defineLayer");
+  ParameterDeclaration d = declaration(ParameterKind::Layer, label, id, flags);
+  return finishDeclaration(host, "defineLayer", std::move(d), commonArguments(label, id, flags));
+}
+
+int32_t defineControl(HostContext context, const char16_t* label, const char* id, uint32_t flags,
+                      const char16_t* secondText, double aspect, int32_t size1, int32_t size2,
+                      int32_t size3, int32_t size4) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("defineControl");
+  ParameterDeclaration d = declaration(ParameterKind::Control, label, id, flags);
+  d.secondText = textOrEmpty(secondText);
+  d.aspect = aspect;
+  d.controlSizes = {size1, size2, size3, size4};
+  char aspectText[32];
+  std::snprintf(aspectText, sizeof aspectText, "%.17g", aspect);
+  const std::string arguments =
+      commonArguments(label, id, flags) + ", text=" + inQuotes(std::u16string_view(d.secondText)) +
+      ", aspect=" + aspectText + ", sizes=" + std::to_string(size1) + "," + std::to_string(size2) +
+      "," + std::to_string(size3) + "," + std::to_string(size4);
+  return finishDeclaration(host, "defineControl", std::move(d), arguments);
+}
+
+// ---- panel state --------------------------------------------------------------------------
+
+int32_t setParamVisible(HostContext context, const char* id, const uint8_t* shown) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("setParamVisible");
+  const bool known =
+      id != nullptr && shown != nullptr && host.parameters().setVisible(id, *shown != 0);
+  if (!known) {
+    host.noteUnknownId(id);
+  }
+  host.trace().callback("setParamVisible",
+                        inQuotes(id) + ", " + (shown == nullptr ? "null" : std::to_string(*shown)),
+                        known ? "0" : "1");
+  return known ? 0 : 1;
+}
+
+// Reads the numbers of a parameter, noting an id the panel does not have.
+std::array<double, 3> readNumbers(EffectHost& host, const char* id) {
+  std::array<double, 3> value{};
+  if (id == nullptr || !host.parameters().readNumbers(id, value)) {
+    host.noteUnknownId(id);
+  }
+  return value;
+}
+
+std::string readArguments(const char* id, int32_t time) {
+  return inQuotes(id) + ", t=" + std::to_string(time);
+}
+
+float getFloat(HostContext context, const char* id, int32_t time) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("getFloat");
+  const auto value = static_cast<float>(readNumbers(host, id)[0]);
+  host.trace().callback("getFloat", readArguments(id, time), number(value));
+  return value;
+}
+
+float getAngle(HostContext context, const char* id, int32_t time) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("getAngle");
+  const auto value = static_cast<float>(readNumbers(host, id)[0]);
+  host.trace().callback("getAngle", readArguments(id, time), number(value));
+  return value;
+}
+
+uint8_t getBool(HostContext context, const char* id, int32_t time) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("getBool");
+  const uint8_t value = readNumbers(host, id)[0] != 0 ? 1 : 0;
+  host.trace().callback("getBool", readArguments(id, time), std::to_string(value));
+  return value;
+}
+
+int32_t getInt(HostContext context, const char* id, int32_t time) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("getInt");
+  int32_t value = 0;
+  if (id == nullptr || !host.parameters().readInt(id, value)) {
+    host.noteUnknownId(id);
+  }
+  host.trace().callback("getInt", readArguments(id, time), std::to_string(value));
+  return value;
+}
+
+void getPoint(HostContext context, const char* id, int32_t time, float* x, float* y) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("getPoint");
+  const std::array<double, 3> value = readNumbers(host, id);
+  if (x != nullptr) {
+    *x = static_cast<float>(value[0]);
+  }
+  if (y != nullptr) {
+    *y = static_cast<float>(value[1]);
+  }
+  host.trace().callback("getPoint", readArguments(id, time),
+                        "(" + number(value[0]) + ", " + number(value[1]) + ")");
+}
+
+void getColor(HostContext context, const char* id, int32_t time, float* red, float* green,
+              float* blue) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("getColor");
+  const std::array<double, 3> value = readNumbers(host, id);
+  float* outputs[3] = {red, green, blue};
+  for (int i = 0; i < 3; ++i) {
+    if (outputs[i] != nullptr) {
+      *outputs[i] = static_cast<float>(value[i]);
+    }
+  }
+  host.trace().callback(
+      "getColor", readArguments(id, time),
+      "(" + number(value[0]) + ", " + number(value[1]) + ", " + number(value[2]) + ")");
+}
+
+void* getLayer(HostContext context, const char* id, int32_t time, int32_t layerArgument,
+               char* identifierOut) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("getLayer");
+  readNumbers(host, id);  // notes an unknown id
+  if (identifierOut != nullptr) {
+    std::memcpy(identifierOut, kNoLayerIdentifier, kIdentifierChars);
+  }
+  host.trace().callback("getLayer", readArguments(id, time) + ", " + std::to_string(layerArgument),
+                        "null");
+  return nullptr;
+}
+
+int32_t getLayerInfo(HostContext context, const void* layer, int32_t time, HostLayerInfo* out) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("getLayerInfo");
+  const HostLayer* known = host.findLayer(layer);
+  const bool filled = known != nullptr && out != nullptr && !host.faults().failLayerInfo;
+  if (filled) {
+    *out = known->info;
+  }
+  char arguments[64];
+  std::snprintf(arguments, sizeof arguments, "%p, t=%d", layer, time);
+  host.trace().callback("getLayerInfo", arguments,
+                        filled ? "0 (height " + std::to_string(known->info.height) + ")" : "1");
+  return filled ? 0 : 1;
+}
+
+void setBool(HostContext context, const char* id, int32_t time, uint8_t value, int32_t) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("setBool");
+  if (id == nullptr || !host.parameters().writeBool(id, value != 0)) {
+    host.noteUnknownId(id);
+  }
+  host.trace().callback("setBool", readArguments(id, time) + ", " + std::to_string(value), "");
+}
+
+void setInt(HostContext context, const char* id, int32_t time, int32_t value, int32_t) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("setInt");
+  if (id == nullptr || !host.parameters().writeInt(id, value)) {
+    host.noteUnknownId(id);
+  }
+  host.trace().callback("setInt", readArguments(id, time) + ", " + std::to_string(value), "");
+}
+
+// ---- rendering ----------------------------------------------------------------------------
+
+int32_t progress(HostContext context, int32_t done, int32_t total) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("progress");
+  host.trace().callback("progress", std::to_string(done) + "/" + std::to_string(total), "0");
+  return 0;
+}
+
+void redrawControl(HostContext context, const char* id) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("redrawControl");
+  host.noteRedraw();
+  host.trace().callback("redrawControl", inQuotes(id), "");
+}
+
+}  // namespace
+
+void installCallbacks(HostEffectRecord& record) {
+  record.hostIdentifier = hostIdentifier;
+  record.hostVersion = hostVersion;
+  record.beginGroup = beginGroup;
+  record.endGroup = endGroup;
+  record.defineFloat = defineFloat;
+  record.defineBool = defineBool;
+  record.defineChoice = defineChoice;
+  record.definePoint = definePoint;
+  record.defineAngle = defineAngle;
+  record.defineColor = defineColor;
+  record.defineLayer = defineLayer;
+  record.setParamVisible = setParamVisible;
+  record.getFloat = getFloat;
+  record.getBool = getBool;
+  record.getInt = getInt;
+  record.getPoint = getPoint;
+  record.getAngle = getAngle;
+  record.getColor = getColor;
+  record.getLayer = getLayer;
+  record.getLayerInfo = getLayerInfo;
+  record.progress = progress;
+  record.setBool = setBool;
+  record.setInt = setInt;
+  record.defineSlider = defineSlider;
+  record.defineControl = defineControl;
+  record.redrawControl = redrawControl;
+}
+
+}  // namespace vtpl::host

@@ -1,0 +1,81 @@
+// vtpl-host: loads an effect module the way the editor does and runs one command with it.
+#include <unistd.h>
+
+#include <iostream>
+#include <string>
+#include <vector>
+
+#include "command_line.h"
+#include "effect_host.h"
+#include "panel_printer.h"
+#include "plugin_module.h"
+#include "utf16_text.h"
+
+namespace {
+
+using namespace vtpl::host;
+
+std::filesystem::path defaultPluginPath() {
+  std::error_code error;
+  const std::filesystem::path tool = std::filesystem::read_symlink("/proc/self/exe", error);
+  return tool.parent_path() / "plugins" / "scopes" / "Waveform.vtpl";
+}
+
+HostSettings settingsFrom(const CommandLine& line) {
+  HostSettings settings;
+  if (line.hostVersion) {
+    settings.version = *line.hostVersion;
+  }
+  if (line.hostIdentifier) {
+    settings.identifier = toUtf16(*line.hostIdentifier);
+  }
+  settings.verbose = line.verbose;
+  return settings;
+}
+
+void warnAboutUnknownIds(const EffectHost& host) {
+  if (host.unknownParameterIds().empty()) {
+    return;
+  }
+  std::cerr << "vtpl-host: warning: the effect used parameter ids the panel does not have:";
+  for (const std::string& id : host.unknownParameterIds()) {
+    std::cerr << ' ' << id;
+  }
+  std::cerr << '\n';
+}
+
+int runInfo(const CommandLine& line, const PluginModule& module) {
+  const PluginInformation information = module.information();
+  EffectHost host(module, settingsFrom(line), line.trace ? &std::cerr : nullptr);
+  host.open();
+  for (const auto& [id, value] : line.settings) {
+    host.setValueFromText(id, value);
+  }
+  printInformation(std::cout, information);
+  std::cout << "\nParameters (" << host.parameters().parameters().size() << "), as host "
+            << toUtf8(host.settings().identifier) << ' ' << host.settings().version
+            << " shows them:\n";
+  printPanel(std::cout, host.parameters());
+  warnAboutUnknownIds(host);
+  return 0;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  try {
+    const CommandLine line = parseCommandLine(std::vector<std::string>(argv + 1, argv + argc));
+    if (line.command == "help") {
+      std::cout << usageText();
+      return 0;
+    }
+    const PluginModule module(line.plugin.empty() ? defaultPluginPath() : line.plugin);
+    return runInfo(line, module);
+  } catch (const UsageError& error) {
+    std::cerr << "vtpl-host: " << error.what() << "\n\n" << usageText();
+    return 2;
+  } catch (const std::exception& error) {
+    std::cerr << "vtpl-host: " << error.what() << '\n';
+    return 1;
+  }
+}

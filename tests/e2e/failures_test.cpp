@@ -1,0 +1,103 @@
+// A host that refuses, throws or leaves slots empty gets a result code, never a crash.
+#include <gtest/gtest.h>
+
+#include <climits>
+
+#include "waveform_module.h"
+
+namespace waveform_test {
+namespace {
+
+using vtpl::host::EffectHost;
+
+// Messages 3 and 0, then the declarations; returns the result of message 2.
+int32_t declareWith(EffectHost& host) {
+  EXPECT_EQ(host.send(vtpl::kMessageCreateSharedData), 1);
+  EXPECT_EQ(host.send(vtpl::kMessageCreateInstance), 1);
+  return host.send(vtpl::kMessageDeclareParameters);
+}
+
+TEST(Failures, RefusedThirdDeclarationKeepsTheFirstTwo) {
+  EffectHost host(waveformModule(), declaredStateSettings());
+  host.faults().rejectDeclaration = 3;
+  EXPECT_EQ(declareWith(host), 5);
+  const auto& declared = host.parameters().parameters();
+  ASSERT_EQ(declared.size(), 2u);
+  EXPECT_EQ(declared[0].declaration.id, "waveformControl");
+  EXPECT_EQ(declared[1].declaration.id, "waveformMode");
+  // The instance survives a failed declaration and is destroyed normally.
+  EXPECT_EQ(host.send(vtpl::kMessageDestroyInstance), 1);
+}
+
+TEST(Failures, EveryRefusedDeclarationEndsTheDeclarationsThere) {
+  for (int refused = 2; refused <= 25; ++refused) {
+    EffectHost host(waveformModule(), declaredStateSettings());
+    host.faults().rejectDeclaration = refused;
+    EXPECT_EQ(declareWith(host), 5) << refused;
+    EXPECT_EQ(host.parameters().parameters().size(), static_cast<size_t>(refused - 1)) << refused;
+  }
+}
+
+TEST(Failures, RefusedCustomControlIsNotAnError) {
+  EffectHost host(waveformModule(), declaredStateSettings());
+  host.faults().rejectDeclaration = 1;
+  EXPECT_EQ(declareWith(host), 1);
+  EXPECT_EQ(host.parameters().parameters().size(), 24u);
+  EXPECT_EQ(host.parameters().find("waveformControl"), nullptr);
+}
+
+TEST(Failures, ExceptionsThrownByHostCallbacksBecomeResultFive) {
+  struct Case {
+    const char* callback;
+    bool nonStandard;
+    int32_t message;
+    const char* changedId;
+  };
+  const Case cases[] = {
+      {"getInt", false, 7, "waveformMode"},
+      {"getInt", true, 7, "blendType"},
+      {"setParamVisible", false, 7, "scopeComparisonType"},
+      {"setBool", true, 13, "colorSpace"},
+      {"setBool", false, 14, "colorSpace"},
+  };
+  for (const Case& c : cases) {
+    auto host = openHost();
+    host->faults().throwInCallback = c.callback;
+    host->faults().throwNonStandard = c.nonStandard;
+    EXPECT_EQ(host->editParameter(c.changedId, c.message), 5) << c.callback;
+    host->faults().throwInCallback.clear();
+    EXPECT_EQ(host->changeParameter(c.changedId), 1) << "module unusable after " << c.callback;
+  }
+}
+
+TEST(Failures, ExceptionDuringDeclarationsBecomesResultFive) {
+  for (const bool nonStandard : {false, true}) {
+    EffectHost host(waveformModule(), declaredStateSettings());
+    host.faults().throwInCallback = "defineBool";
+    host.faults().throwNonStandard = nonStandard;
+    EXPECT_EQ(declareWith(host), 5);
+    EXPECT_EQ(host.parameters().parameters().size(), 8u);  // up to "showComparison"
+  }
+}
+
+TEST(Failures, EmptyCallbackSlotsAreReportedNotCalled) {
+  auto host = openHost();
+  host->record().getInt = nullptr;
+  EXPECT_EQ(host->changeParameter("waveformMode"), 5);
+
+  EffectHost declaring(waveformModule(), declaredStateSettings());
+  declaring.record().defineChoice = nullptr;
+  EXPECT_EQ(declareWith(declaring), 5);
+  EXPECT_EQ(declaring.parameters().parameters().size(), 1u);
+}
+
+TEST(Failures, NullRecordIsNotHandledAndCreatesNothing) {
+  const vtpl::NotifyFn notify = waveformModule().notifyEntry();
+  for (const int32_t message :
+       {0, 1, 2, 3, 4, 7, 8, 10, 11, 13, 1001, 1002, 1003, 1004, -1, INT32_MAX}) {
+    EXPECT_EQ(notify(nullptr, nullptr, message), 2) << message;
+  }
+}
+
+}  // namespace
+}  // namespace waveform_test

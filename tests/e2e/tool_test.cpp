@@ -1,0 +1,177 @@
+// vtpl-host run as a user runs it: what it prints and how it fails.
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <fstream>
+#include <sstream>
+#include <string>
+#include <vector>
+
+namespace waveform_test {
+namespace {
+
+struct ToolRun {
+  int exitCode = -1;
+  std::string out;
+  std::string err;
+};
+
+std::string shellQuoted(const std::string& text) {
+  std::string quoted = "'";
+  for (char c : text) {
+    quoted += c == '\'' ? std::string("'\\''") : std::string(1, c);
+  }
+  return quoted + "'";
+}
+
+ToolRun runTool(const std::vector<std::string>& arguments) {
+  char errPath[] = "/tmp/vtpl-host-test-XXXXXX";
+  const int errFile = mkstemp(errPath);
+  EXPECT_GE(errFile, 0);
+  std::string command = shellQuoted(VTPL_HOST_TOOL_PATH);
+  for (const std::string& argument : arguments) {
+    command += " " + shellQuoted(argument);
+  }
+  command += " 2>" + std::string(errPath);
+
+  ToolRun run;
+  FILE* pipe = popen(command.c_str(), "r");
+  char buffer[4096];
+  size_t count = 0;
+  while ((count = std::fread(buffer, 1, sizeof buffer, pipe)) > 0) {
+    run.out.append(buffer, count);
+  }
+  const int status = pclose(pipe);
+  run.exitCode = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+  std::ifstream errStream(errPath);
+  run.err.assign(std::istreambuf_iterator<char>(errStream), {});
+  close(errFile);
+  std::remove(errPath);
+  return run;
+}
+
+// The panel line of a parameter id, empty if the id is not printed.
+std::string panelLine(const std::string& output, const std::string& id) {
+  std::istringstream lines(output);
+  for (std::string line; std::getline(lines, line);) {
+    std::istringstream words(line);
+    std::vector<std::string> fields;
+    for (std::string word; words >> word;) {
+      fields.push_back(word);
+    }
+    for (const std::string& field : fields) {
+      if (field == id) {
+        return line;
+      }
+    }
+  }
+  return "";
+}
+
+bool hasWord(const std::string& line, const std::string& word) {
+  std::istringstream words(line);
+  for (std::string w; words >> w;) {
+    if (w == word) {
+      return true;
+    }
+  }
+  return false;
+}
+
+TEST(Tool, InfoPrintsInformationAndThePanelTree) {
+  const ToolRun run = runTool({"info"});
+  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_EQ(run.err, "");
+  EXPECT_NE(run.out.find("Waveform {scopes}\n"), std::string::npos);
+  EXPECT_NE(run.out.find("{CDE6FB0A-BF41-4524-A6BC-3BB8DAC569D6}"), std::string::npos);
+  EXPECT_NE(run.out.find("Parameters (25)"), std::string::npos);
+  // Groups nest by indentation, each header on its own line before its parameters.
+  EXPECT_NE(run.out.find("\n  Controls\n    Mode "), std::string::npos) << run.out;
+  EXPECT_NE(run.out.find("\n    Clip\n      Start "), std::string::npos) << run.out;
+  EXPECT_NE(run.out.find("\n      Position\n        Top-Left "), std::string::npos) << run.out;
+
+  const std::string mode = panelLine(run.out, "waveformMode");
+  EXPECT_TRUE(hasWord(mode, "choice")) << mode;
+  EXPECT_TRUE(hasWord(mode, "shown")) << mode;
+  EXPECT_NE(mode.find("Luminance=0 | RGB=1 | CbCr=4"), std::string::npos) << mode;
+  const std::string brightness = panelLine(run.out, "waveformBrightness");
+  EXPECT_NE(brightness.find("= 1.00; range 0.1 to 10, slider 0.1 to 2"), std::string::npos)
+      << brightness;
+  // The editor's opening announcements hide what Side by Side and blend None do not use.
+  EXPECT_TRUE(hasWord(panelLine(run.out, "overlayChannels"), "hidden"));
+  EXPECT_TRUE(hasWord(panelLine(run.out, "scopePositionTL"), "hidden"));
+}
+
+TEST(Tool, SetChangesValuesAndVisibility) {
+  const ToolRun run = runTool({"info", "--set", "scopeComparisonType=Overlay", "--set=blendType=9",
+                               "--set", "waveformBrightness=0.5"});
+  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_TRUE(hasWord(panelLine(run.out, "overlayChannels"), "shown"));
+  EXPECT_TRUE(hasWord(panelLine(run.out, "showComparison"), "hidden"));
+  EXPECT_NE(panelLine(run.out, "blendType").find("= Multiply (default None)"), std::string::npos);
+  EXPECT_TRUE(hasWord(panelLine(run.out, "scopePositionTL"), "shown"));
+  EXPECT_NE(panelLine(run.out, "waveformBrightness").find("= 0.50 (default 1.00)"),
+            std::string::npos);
+}
+
+TEST(Tool, HostVersionChangesTheLayerLabel) {
+  const ToolRun run = runTool({"info", "--host-version", "5300"});
+  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_TRUE(hasWord(panelLine(run.out, "overlayLayer"), "Layer"));
+  EXPECT_EQ(panelLine(run.out, "overlayLayer").find("Compare To"), std::string::npos);
+}
+
+TEST(Tool, TraceLogsMessagesAndCallbacksToStandardError) {
+  const ToolRun run = runTool({"info", "--trace"});
+  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_NE(run.err.find("> Notify 2 (declare parameters)\n"), std::string::npos);
+  EXPECT_NE(run.err.find("    defineChoice(label=\"Mode\", id=\"waveformMode\", flags=0x100, "
+                         "items=\"Luminance|RGB|CbCr|Red|Green|Blue|Alpha\", "
+                         "values=[0,1,4,5,6,7,8], default=0) -> 0\n"),
+            std::string::npos);
+  EXPECT_NE(run.err.find("< Notify 4 -> 1\n"), std::string::npos);
+  EXPECT_EQ(run.out.find("Notify"), std::string::npos);
+}
+
+TEST(Tool, FailuresSayWhatWentWrong) {
+  struct Case {
+    std::vector<std::string> arguments;
+    int exitCode;
+    std::string message;
+  };
+  const Case cases[] = {
+      {{"info", "--plugin", "/nonexistent/Effect.vtpl"},
+       1,
+       "plug-in module '/nonexistent/Effect.vtpl' does not exist"},
+      {{"info", "--plugin", NO_NOTIFY_MODULE_PATH},
+       1,
+       std::string("'") + NO_NOTIFY_MODULE_PATH +
+           "' is not a plug-in module: it does not export "
+           "'Notify'"},
+      {{"info", "--set", "waveformMode=Purple"},
+       1,
+       "waveformMode: 'Purple' is not one of Luminance (0), RGB (1), CbCr (4)"},
+      {{"info", "--set", "noSuchParameter=1"}, 1, "no parameter has the id 'noSuchParameter'"},
+      {{"info", "--set", "renderToLayerLabelScale=20"}, 1, "is outside 1 to 10"},
+      {{"paint"}, 2, "unknown command 'paint'"},
+      {{"info", "--colour"}, 2, "unknown option '--colour'"},
+      {{}, 2, "no command given"},
+  };
+  for (const Case& c : cases) {
+    const ToolRun run = runTool(c.arguments);
+    EXPECT_EQ(run.exitCode, c.exitCode) << c.message;
+    EXPECT_NE(run.err.find(c.message), std::string::npos) << run.err;
+    EXPECT_EQ(run.out, "") << c.message;
+  }
+}
+
+TEST(Tool, HelpPrintsUsage) {
+  const ToolRun run = runTool({"help"});
+  EXPECT_EQ(run.exitCode, 0);
+  EXPECT_NE(run.out.find("usage: vtpl-host COMMAND"), std::string::npos);
+}
+
+}  // namespace
+}  // namespace waveform_test

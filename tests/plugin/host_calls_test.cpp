@@ -1,0 +1,51 @@
+// The effect's door to the host: refusals and empty slots become "Plugin Error".
+#include "gl/host_calls.h"
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+
+namespace {
+
+using Plugin::gl::HostCalls;
+using Plugin::gl::PluginException;
+using vtpl::HostEffectRecord;
+
+int32_t refusingEndGroup(vtpl::HostContext) {
+  return 3;
+}
+int32_t acceptingEndGroup(vtpl::HostContext) {
+  return 0;
+}
+int32_t contextAsVersion(vtpl::HostContext context) {
+  return *static_cast<const int32_t*>(context);
+}
+
+TEST(HostCalls, PassesTheContextAndReturnsTheAnswer) {
+  HostEffectRecord record{};
+  record.hostVersion = contextAsVersion;
+  int32_t version = 5600;
+  const HostCalls host(&version, record);
+  EXPECT_EQ(host.call(&HostEffectRecord::hostVersion), 5600);
+}
+
+TEST(HostCalls, EmptySlotIsAPluginErrorNotAJump) {
+  HostEffectRecord record{};
+  const HostCalls host(nullptr, record);
+  try {
+    host.call(&HostEffectRecord::getInt, "waveformMode", 0);
+    FAIL() << "no exception";
+  } catch (const PluginException& error) {
+    EXPECT_STREQ(error.what(), "Plugin Error");
+  }
+}
+
+TEST(HostCalls, RefusedDeclarationIsAPluginError) {
+  HostEffectRecord record{};
+  record.endGroup = refusingEndGroup;
+  EXPECT_THROW(HostCalls(nullptr, record).declare(&HostEffectRecord::endGroup), PluginException);
+  record.endGroup = acceptingEndGroup;
+  EXPECT_NO_THROW(HostCalls(nullptr, record).declare(&HostEffectRecord::endGroup));
+}
+
+}  // namespace

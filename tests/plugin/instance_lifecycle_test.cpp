@@ -1,0 +1,95 @@
+// The instance and shared data as the dispatcher creates, counts and destroys them.
+#include "plugin/instance_lifecycle.h"
+
+#include <gtest/gtest.h>
+
+#include <thread>
+#include <vector>
+
+#include "plugin/notify.h"
+#include "plugin/scopes_effect_data.h"
+#include "plugin/scopes_shared_data.h"
+
+namespace {
+
+using namespace plugin::Scopes;
+
+TEST(InstanceLifecycle, SharedDataStartsEmptyAndFresh) {
+  vtpl::HostEffectRecord record{};
+  ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateSharedData), 1);
+  const ScopesSharedData* shared = sharedDataOf(record);
+  ASSERT_NE(shared, nullptr);
+  EXPECT_EQ(shared->primary.texture, nullptr);
+  EXPECT_EQ(shared->primary.width, 0);
+  EXPECT_EQ(shared->primary.height, 0);
+  EXPECT_EQ(shared->comparison.texture, nullptr);
+  EXPECT_EQ(shared->comparison.width, 0);
+  EXPECT_EQ(shared->analysedFrame, -1);
+  EXPECT_EQ(shared->attachmentCount.load(), 0);
+  EXPECT_EQ(shared->resultsFresh.load(), 1);
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroySharedData), 1);
+  EXPECT_EQ(record.sharedData, nullptr);
+}
+
+TEST(InstanceLifecycle, AttachAndDetachCount) {
+  vtpl::HostEffectRecord record{};
+  ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateSharedData), 1);
+  for (int32_t message : {1001, 1001, 1001, 1002}) {
+    EXPECT_EQ(notify(nullptr, &record, message), 1);
+  }
+  EXPECT_EQ(sharedDataOf(record)->attachmentCount.load(), 2);
+  for (int32_t message : {1002, 1002, 1002}) {
+    EXPECT_EQ(notify(nullptr, &record, message), 1);
+  }
+  EXPECT_EQ(sharedDataOf(record)->attachmentCount.load(), -1);
+  notify(nullptr, &record, vtpl::kMessageDestroySharedData);
+}
+
+TEST(InstanceLifecycle, AttachmentsFromTwoThreadsAreNotLost) {
+  vtpl::HostEffectRecord record{};
+  ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateSharedData), 1);
+  constexpr int kRounds = 20000;
+  auto attachThenDetachHalf = [&record] {
+    for (int i = 0; i < kRounds; ++i) {
+      notify(nullptr, &record, vtpl::kMessageAttach);
+      if (i % 2 == 0) {
+        notify(nullptr, &record, vtpl::kMessageDetach);
+      }
+    }
+  };
+  std::thread render(attachThenDetachHalf);
+  std::thread interface(attachThenDetachHalf);
+  render.join();
+  interface.join();
+  EXPECT_EQ(sharedDataOf(record)->attachmentCount.load(), kRounds);
+  notify(nullptr, &record, vtpl::kMessageDestroySharedData);
+}
+
+TEST(InstanceLifecycle, InstanceStartsEmptyAndSetUpEnablesInstancedDrawing) {
+  vtpl::HostEffectRecord record{};
+  ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateInstance), 1);
+  ScopesEffectData* instance = instanceOf(record);
+  ASSERT_NE(instance, nullptr);
+  EXPECT_FALSE(instance->instancedDrawing);
+  EXPECT_TRUE(instance->stencilPool.empty());
+  EXPECT_TRUE(instance->labelCache.empty());
+  EXPECT_TRUE(instance->labelTextSettings.familyName.empty());
+
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageSetUp), 1);
+  EXPECT_TRUE(instance->instancedDrawing);
+
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroyInstance), 1);
+  EXPECT_EQ(record.instance, nullptr);
+}
+
+TEST(InstanceLifecycle, ResourceLockIsRecursive) {
+  vtpl::HostEffectRecord record{};
+  createInstance(record);
+  ScopesEffectData& instance = *instanceOf(record);
+  std::lock_guard<std::recursive_mutex> outer(instance.resourceLock);
+  EXPECT_TRUE(instance.resourceLock.try_lock());
+  instance.resourceLock.unlock();
+  EXPECT_EQ(destroyInstance(record), 1);
+}
+
+}  // namespace
