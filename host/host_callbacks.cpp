@@ -102,43 +102,51 @@ int32_t endGroup(HostContext context) {
   return status;
 }
 
+// Float and slider declarations share everything but the slider's own range.
+struct NumberDeclaration {
+  const char16_t* label;
+  const char16_t* unit;
+  const char* id;
+  uint32_t flags;
+  float min, max, sliderMin, sliderMax, defaultValue;
+  int32_t decimals;
+};
+
+int32_t declareNumber(HostContext context, std::string_view name, ParameterKind kind,
+                      const NumberDeclaration& n) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback(name);
+  ParameterDeclaration d = declaration(kind, n.label, n.id, n.flags);
+  d.unit = textOrEmpty(n.unit);
+  d.min = n.min;
+  d.max = n.max;
+  d.defaults[0] = n.defaultValue;
+  d.decimals = n.decimals;
+  std::string arguments = commonArguments(n.label, n.id, n.flags) +
+                          ", unit=" + inQuotes(std::u16string_view(d.unit)) +
+                          ", min=" + number(n.min) + ", max=" + number(n.max);
+  if (kind == ParameterKind::Slider) {
+    d.sliderMin = n.sliderMin;
+    d.sliderMax = n.sliderMax;
+    arguments += ", sliderMin=" + number(n.sliderMin) + ", sliderMax=" + number(n.sliderMax);
+  }
+  arguments += ", default=" + number(n.defaultValue) + ", decimals=" + std::to_string(n.decimals);
+  return finishDeclaration(host, name, std::move(d), arguments);
+}
+
 int32_t defineFloat(HostContext context, const char16_t* label, const char16_t* unit,
                     const char* id, uint32_t flags, float min, float max, float defaultValue,
                     int32_t decimals) {
-  EffectHost& host = hostOf(context);
-  host.enterCallback("defineFloat");
-  ParameterDeclaration d = declaration(ParameterKind::Float, label, id, flags);
-  d.unit = textOrEmpty(unit);
-  d.min = min;
-  d.max = max;
-  d.defaults[0] = defaultValue;
-  d.decimals = decimals;
-  const std::string arguments =
-      commonArguments(label, id, flags) + ", unit=" + inQuotes(std::u16string_view(d.unit)) +
-      ", min=" + number(min) + ", max=" + number(max) + ", default=" + number(defaultValue) +
-      ", decimals=" + std::to_string(decimals);
-  return finishDeclaration(host, "defineFloat", std::move(d), arguments);
+  return declareNumber(context, "defineFloat", ParameterKind::Float,
+                       {label, unit, id, flags, min, max, 0, 0, defaultValue, decimals});
 }
 
 int32_t defineSlider(HostContext context, const char16_t* label, const char16_t* unit,
                      const char* id, uint32_t flags, float min, float max, float sliderMin,
                      float sliderMax, float defaultValue, int32_t decimals) {
-  EffectHost& host = hostOf(context);
-  host.enterCallback("defineSlider");
-  ParameterDeclaration d = declaration(ParameterKind::Slider, label, id, flags);
-  d.unit = textOrEmpty(unit);
-  d.min = min;
-  d.max = max;
-  d.sliderMin = sliderMin;
-  d.sliderMax = sliderMax;
-  d.defaults[0] = defaultValue;
-  d.decimals = decimals;
-  const std::string arguments =
-      commonArguments(label, id, flags) + ", unit=" + inQuotes(std::u16string_view(d.unit)) +
-      ", min=" + number(min) + ", max=" + number(max) + ", sliderMin=" + number(sliderMin) +
-      ", sliderMax=" + number(sliderMax) + ", default=" + number(defaultValue) +
-      ", decimals=" + std::to_string(decimals);
-  return finishDeclaration(host, "defineSlider", std::move(d), arguments);
+  return declareNumber(
+      context, "defineSlider", ParameterKind::Slider,
+      {label, unit, id, flags, min, max, sliderMin, sliderMax, defaultValue, decimals});
 }
 
 int32_t defineBool(HostContext context, const char16_t* label, const char* id, uint32_t flags,

@@ -38,7 +38,9 @@ PluginModule::PluginModule(const std::filesystem::path& path) : path_(path) {
   if (!std::filesystem::is_regular_file(path, error)) {
     throw HostError("plug-in module '" + path.string() + "' does not exist or is not a file");
   }
-  handle_ = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
+  // A name without a folder would send dlopen searching the library path instead of the file.
+  const std::filesystem::path file = std::filesystem::absolute(path, error);
+  handle_ = dlopen(file.c_str(), RTLD_NOW | RTLD_LOCAL);
   if (handle_ == nullptr) {
     throw HostError("cannot load plug-in module '" + path.string() + "': " + dlerror());
   }

@@ -26,11 +26,13 @@ std::string shellQuoted(const std::string& text) {
   return quoted + "'";
 }
 
-ToolRun runTool(const std::vector<std::string>& arguments) {
+// Runs the tool from `folder` when one is given.
+ToolRun runTool(const std::vector<std::string>& arguments, const std::string& folder = "") {
   char errPath[] = "/tmp/vtpl-host-test-XXXXXX";
   const int errFile = mkstemp(errPath);
   EXPECT_GE(errFile, 0);
-  std::string command = shellQuoted(VTPL_HOST_TOOL_PATH);
+  std::string command = folder.empty() ? "" : "cd " + shellQuoted(folder) + " && ";
+  command += shellQuoted(VTPL_HOST_TOOL_PATH);
   for (const std::string& argument : arguments) {
     command += " " + shellQuoted(argument);
   }
@@ -165,6 +167,15 @@ TEST(Tool, FailuresSayWhatWentWrong) {
     EXPECT_NE(run.err.find(c.message), std::string::npos) << run.err;
     EXPECT_EQ(run.out, "") << c.message;
   }
+}
+
+TEST(Tool, PluginPathWithoutFolderIsTheFileInTheCurrentFolder) {
+  const std::string module = WAVEFORM_MODULE_PATH;
+  const size_t slash = module.rfind('/');
+  const ToolRun run =
+      runTool({"info", "--plugin", module.substr(slash + 1)}, module.substr(0, slash));
+  EXPECT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_NE(run.out.find("Parameters (25)"), std::string::npos);
 }
 
 TEST(Tool, HelpPrintsUsage) {
