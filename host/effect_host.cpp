@@ -35,8 +35,11 @@ void EffectHost::open() {
                       " parameter group(s) open");
     }
     if (settings_.announceInitialValues) {
-      for (const Parameter& parameter : std::vector<Parameter>(store_.parameters())) {
-        const std::string& id = parameter.declaration.id;
+      std::vector<std::string> ids;
+      for (const Parameter& parameter : store_.parameters()) {
+        ids.push_back(parameter.declaration.id);
+      }
+      for (const std::string& id : ids) {
         expectHandled(kMessageParameterChanged, changeParameter(id), "react to '" + id + "'");
       }
     }

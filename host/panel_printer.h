@@ -4,7 +4,6 @@
 
 #include <ostream>
 
-#include "effect_host.h"
 #include "parameter_store.h"
 #include "plugin_module.h"
 

@@ -1,6 +1,4 @@
 // vtpl-host: loads an effect module the way the editor does and runs one command with it.
-#include <unistd.h>
-
 #include <iostream>
 #include <string>
 #include <vector>
