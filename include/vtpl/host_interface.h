@@ -24,7 +24,7 @@ enum MessageCode : int32_t {
   kMessageParameterChanged = 7,
   kMessageSetUp = 8,
   kMessageRender = 10,
-  kMessageAcknowledged11 = 11,
+  kMessageAcknowledged = 11,
   kMessageParameterEdited = 13,
   kMessageParameterEditedAlt = 14,
   kMessageAttach = 1001,

@@ -43,12 +43,13 @@ int32_t handleMessage(HostContext context, HostEffectRecord& record, int32_t mes
       setUp(host, *instanceOf(record));
       return kResultHandled;
     case kMessageRender:
+      // Nothing is drawn yet: the output is left as the host gave it.
       return kResultHandled;
     case kMessageParameterEdited:
     case kMessageParameterEditedAlt:
       parameterEdited(host, changedParameterId(record));
       return kResultHandled;
-    case kMessageAcknowledged11:
+    case kMessageAcknowledged:
       return kResultHandled;
     case kMessageAttach:
       attachControl(record);
@@ -57,6 +58,7 @@ int32_t handleMessage(HostContext context, HostEffectRecord& record, int32_t mes
       detachControl(record);
       return kResultHandled;
     case kMessageDrawControl:
+      // Nothing is drawn yet: the control is left as the host gave it.
       return kResultHandled;
     default:
       if (message >= kMessageAcknowledgedFirst && message <= kMessageAcknowledgedLast) {
