@@ -1,17 +1,83 @@
-// Base of every effect instance's data. It will hold the instance's registry of named GLSL
-// programs; for now it gives the instance its virtual destructor, through which the dispatcher
-// destroys whatever instance the host record holds.
+// Base of every effect instance's data: the registry of its named GLSL programs. Programs are
+// created the first time a pass needs them and live until the instance is destroyed. Everything
+// here issues GL calls and needs the host's context current on the calling thread.
 #ifndef WAVEFORM_GL_EFFECT_DATA_H
 #define WAVEFORM_GL_EFFECT_DATA_H
 
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "gl/gl_api.h"
+
 namespace Plugin::gl {
+
+struct ShaderProgram;
 
 class EffectData {
  public:
-  EffectData() = default;
+  EffectData();
   EffectData(const EffectData&) = delete;
   EffectData& operator=(const EffectData&) = delete;
-  virtual ~EffectData() = default;
+
+  // Builds and attaches the vertex, fragment and (when not empty) geometry stages and registers
+  // the unlinked program under `name`. A stage that fails to compile throws QvGLSLexception and
+  // nothing is registered.
+  virtual void addProgram(const std::string& vertexSource, const std::string& geometrySource,
+                          const std::string& fragmentSource, bool echo, const std::string& name);
+  virtual void addProgram(const std::string& vertexSource, const std::string& fragmentSource,
+                          bool echo, const std::string& name);
+  // Links a registered program; throws QvGLSLexception (link) on failure. An unknown name
+  // answers false.
+  virtual bool linkProgram(const std::string& name, bool echo);
+  virtual bool linkProgram(int32_t index, bool echo);
+  // Add, bind the attributes (plain names or the stored sources' names) and link the newest
+  // program. Return 1 when linked, 5 otherwise.
+  virtual int32_t createProgram(const std::string& vertexSource, const std::string& geometrySource,
+                                const std::string& fragmentSource, bool echo,
+                                const std::string& name, bool useStoredNames);
+  virtual int32_t createProgram(const std::string& vertexSource, const std::string& fragmentSource,
+                                bool echo, const std::string& name, bool useStoredNames,
+                                bool withTexCoord);
+  virtual int32_t createProgramTwoTexCoords(const std::string& vertexSource,
+                                            const std::string& fragmentSource, bool echo,
+                                            const std::string& name, bool useStoredNames);
+  // Destroys the programs from the newest to the oldest.
+  virtual ~EffectData();
+
+  // The GL program registered under `name`, or -1.
+  int32_t programId(const std::string& name) const;
+  void useProgram(const std::string& name) const;
+  void releaseProgram() const;
+  // Takes effect at the program's next link; an unknown program name does nothing.
+  void bindAttribute(const std::string& programName, GLuint location,
+                     const std::string& attributeName) const;
+  // Asks the current program when it is one of ours, else the first registered; -1 when the
+  // uniform is unknown or nothing is registered.
+  GLint uniformLocation(const std::string& uniformName) const;
+
+  void setUniform1i(GLint location, GLint value) const;
+  void setUniform2i(GLint location, GLint x, GLint y) const;
+  void setUniform1f(GLint location, GLfloat value) const;
+  void setUniform2f(GLint location, GLfloat x, GLfloat y) const;
+  void setUniform4f(GLint location, GLfloat x, GLfloat y, GLfloat z, GLfloat w) const;
+  // Dimensions 2, 3 and 4; any other dimension does nothing.
+  void setUniformMatrix(GLint location, int32_t dimension, GLsizei count, bool transpose,
+                        const GLfloat* values) const;
+
+  int32_t programCount() const { return static_cast<int32_t>(programs_.size()); }
+  // Registered names in name order, each with its creation index.
+  const std::vector<std::pair<std::string, int32_t>>& nameIndex() const { return nameIndex_; }
+
+ private:
+  int32_t indexOf(const std::string& name) const;
+  void bindStandardAttributes(bool useStoredNames, bool withTexCoord, bool twoTexCoords);
+  int32_t linkNewest(bool echo);
+
+  std::vector<std::unique_ptr<ShaderProgram>> programs_;    // in creation order
+  std::vector<std::pair<std::string, int32_t>> nameIndex_;  // sorted by name
 };
 
 }  // namespace Plugin::gl
