@@ -1,0 +1,102 @@
+#include "gl/copy_pass.h"
+
+#include <string>
+
+#include "gl/host_textures.h"
+#include "gl/plugin_exception.h"
+#include "gl/vertex_attributes.h"
+#include "gl/vertex_buffer.h"
+
+namespace Plugin::gl {
+namespace {
+
+const std::string kCopyVertexSource = R"(#version 410
+in vec4 vertexPosition;
+in vec2 vertexTexCoord;
+uniform mat4 projectionMatrix;
+uniform mat4 modelViewMatrix;
+out vec2 texCoord;
+void main() {
+  texCoord = vertexTexCoord;
+  gl_Position = projectionMatrix * modelViewMatrix * vertexPosition;
+}
+)";
+
+const std::string kCopyFragmentSource = R"(#version 410
+uniform sampler2D sourceTexture;
+in vec2 texCoord;
+layout(location = 0) out vec4 fragColour;
+void main() {
+  fragColour = texture(sourceTexture, texCoord);
+}
+)";
+
+const std::string kClearVertexSource = R"(#version 410
+in vec4 vertexPosition;
+in vec2 vertexTexCoord;
+uniform mat4 projectionMatrix;
+uniform mat4 modelViewMatrix;
+void main() {
+  gl_Position = projectionMatrix * modelViewMatrix * vertexPosition;
+}
+)";
+
+const std::string kClearFragmentSource = R"(#version 410
+uniform vec4 clearColour;
+layout(location = 0) out vec4 fragColour;
+void main() {
+  fragColour = clearColour;
+}
+)";
+
+constexpr char kProjectionUniform[] = "projectionMatrix";
+constexpr char kModelViewUniform[] = "modelViewMatrix";
+
+}  // namespace
+
+void ensureCopyAndClearPrograms(EffectData& programs, bool echo) {
+  if (programs.programId(kClearProgram) < 0) {
+    programs.addProgram(kClearVertexSource, kClearFragmentSource, echo, kClearProgram);
+    programs.bindAttribute(kClearProgram, kPositionLocation, kStoredPositionName);
+    if (!programs.linkProgram(kClearProgram, echo)) {
+      throw PluginException(kUnableToLinkClearShaderText);
+    }
+  }
+  if (programs.programId(kCopyProgram) < 0) {
+    programs.createProgram(kCopyVertexSource, kCopyFragmentSource, echo, kCopyProgram, true, true);
+  }
+}
+
+void copyPass(const HostCalls& host, EffectData& programs, const vtpl::HostTexture& source,
+              const vtpl::HostTexture& target) {
+  const auto* render = static_cast<const vtpl::HostRenderRecord*>(host.record().messageRecord);
+  if (programs.programId(kCopyProgram) < 0 || render == nullptr) {
+    return;
+  }
+  programs.useProgram(kCopyProgram);
+  attachTexture(target, 0, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D);
+  programs.setUniformMatrix(programs.uniformLocation(kProjectionUniform), 4, 1, false,
+                            render->projection);
+  programs.setUniformMatrix(programs.uniformLocation(kModelViewUniform), 4, 1, false,
+                            render->modelView);
+
+  // The quad spans the frame; its texture coordinates are the used area of the source.
+  const float w = static_cast<float>(render->frameWidth);
+  const float h = static_cast<float>(render->frameHeight);
+  const float quad[16] = {0, 0, source.uMin, source.vMin, w, 0, source.uMax, source.vMin,
+                          0, h, source.uMin, source.vMax, w, h, source.uMax, source.vMax};
+  bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, source.name, true);
+  drawQuadArrays(host, quad, 4, GL_TRIANGLE_STRIP);
+
+  // Leave the frame's own textures in place for the stage that follows.
+  if (render->destination != nullptr) {
+    attachTexture(*render->destination, 0, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D);
+  }
+  if (render->source != nullptr) {
+    bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, render->source->name, false);
+    resetTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, true);
+  }
+  programs.releaseProgram();
+}
+
+}  // namespace Plugin::gl

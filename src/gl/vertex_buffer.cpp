@@ -1,0 +1,46 @@
+#include "gl/vertex_buffer.h"
+
+#include "gl/vertex_attributes.h"
+
+namespace Plugin::gl {
+namespace {
+
+constexpr GLsizei kVertexStride = 4 * sizeof(float);
+
+}  // namespace
+
+VertexBufferObjectRAII::VertexBufferObjectRAII(const HostCalls& host, const void* data,
+                                               GLuint sizeBytes, GLenum usage, bool keepBuffer)
+    : record_(&host.record()), context_(host.context()), keepBuffer_(keepBuffer) {
+  name_ =
+      host.call(&vtpl::HostEffectRecord::createBuffer, static_cast<uint32_t>(target_),
+                static_cast<uint32_t>(sizeBytes), data, static_cast<uint32_t>(usage), &filled_, 0);
+  glBindBuffer(target_, name_);
+}
+
+VertexBufferObjectRAII::~VertexBufferObjectRAII() {
+  glBindBuffer(target_, 0);
+  if (!keepBuffer_ && record_->releaseBuffer != nullptr) {
+    record_->releaseBuffer(context_, name_);
+  }
+}
+
+void drawQuadArrays(const HostCalls& host, const float* vertices, GLsizei vertexCount,
+                    GLenum mode) {
+  glBindVertexArray(host.call(&vtpl::HostEffectRecord::vertexArray));
+  {
+    const VertexBufferObjectRAII buffer(
+        host, vertices, static_cast<GLuint>(vertexCount) * kVertexStride, GL_DYNAMIC_DRAW);
+    glEnableVertexAttribArray(kPositionLocation);
+    glVertexAttribPointer(kPositionLocation, 2, GL_FLOAT, GL_FALSE, kVertexStride, nullptr);
+    glEnableVertexAttribArray(kTexCoordLocation);
+    glVertexAttribPointer(kTexCoordLocation, 2, GL_FLOAT, GL_FALSE, kVertexStride,
+                          reinterpret_cast<const void*>(2 * sizeof(float)));
+    glDrawArrays(mode, 0, vertexCount);
+    glDisableVertexAttribArray(kPositionLocation);
+    glDisableVertexAttribArray(kTexCoordLocation);
+  }
+  glBindVertexArray(0);
+}
+
+}  // namespace Plugin::gl
