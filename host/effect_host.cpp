@@ -1,5 +1,7 @@
 #include "effect_host.h"
 
+#include <GL/glew.h>
+
 #include <stdexcept>
 
 #include "host_callbacks.h"
@@ -15,6 +17,10 @@ EffectHost::EffectHost(const PluginModule& module, HostSettings settings, std::o
     : module_(module), settings_(std::move(settings)), trace_(trace) {
   record_.verbose = settings_.verbose ? 1 : 0;
   installCallbacks(record_);
+  if (settings_.gl) {
+    renderThread_ = std::make_unique<GlThread>("render");
+    interfaceThread_ = std::make_unique<GlThread>("interface", renderThread_.get());
+  }
 }
 
 EffectHost::~EffectHost() {
@@ -43,6 +49,9 @@ void EffectHost::open() {
         expectHandled(kMessageParameterChanged, changeParameter(id), "react to '" + id + "'");
       }
     }
+    if (settings_.gl) {
+      expectHandled(kMessageSetUp, send(kMessageSetUp), "set up its GL programs");
+    }
   } catch (...) {
     close();
     throw;
@@ -64,7 +73,18 @@ int32_t EffectHost::send(int32_t message) {
 
 int32_t EffectHost::sendWithDetail(int32_t message, const std::string& detail) {
   trace_.messageSent(message, detail);
-  const int32_t result = module_.notifyEntry()(this, &record_, message);
+  int32_t result = 0;
+  const auto deliver = [&] { result = module_.notifyEntry()(this, &record_, message); };
+  GlThread* thread = message == kMessageDrawControl ? interfaceThread_.get() : renderThread_.get();
+  if (thread != nullptr) {
+    thread->run([&] {
+      // Effects draw into whatever framebuffer the host has bound.
+      glBindFramebuffer(GL_FRAMEBUFFER, thread->framebuffer());
+      deliver();
+    });
+  } else {
+    deliver();
+  }
   trace_.messageAnswered(message, result);
   return result;
 }

@@ -10,6 +10,7 @@
 #include <string_view>
 #include <vector>
 
+#include "gl_thread.h"
 #include "parameter_store.h"
 #include "plugin_module.h"
 #include "trace_log.h"
@@ -24,6 +25,10 @@ struct HostSettings {
   // After the declarations, report every parameter once as changed, as the editor does when it
   // opens an effect, so that the effect can set the panel's initial visibility.
   bool announceInitialValues = true;
+  // Run messages on a render and an interface thread with shared headless GL contexts (message
+  // 1003 on the interface thread, all others on the render thread), and send message 8 when
+  // opening. Without it messages run on the caller's thread and no GL is needed.
+  bool gl = false;
 };
 
 // Faults the host commits on request, so tests can see how an effect copes with a bad host.
@@ -101,6 +106,8 @@ class EffectHost {
   int declarationsSeen_ = 0;
   int redrawRequests_ = 0;
   int callbackCount_ = 0;
+  std::unique_ptr<GlThread> renderThread_;
+  std::unique_ptr<GlThread> interfaceThread_;
 };
 
 }  // namespace vtpl::host

@@ -1,9 +1,12 @@
 #include "host_callbacks.h"
 
+#include <GL/glew.h>
+
 #include <cstdio>
 #include <cstring>
 
 #include "effect_host.h"
+#include "gl_thread.h"
 
 namespace vtpl::host {
 namespace {
@@ -394,6 +397,42 @@ void redrawControl(HostContext context, const char* id) {
   host.trace().callback("redrawControl", inQuotes(id), "");
 }
 
+// ---- render interface ---------------------------------------------------------------------
+
+uint32_t vertexArray(HostContext context) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("vertexArray");
+  GlThread* thread = GlThread::current();
+  const uint32_t name = thread != nullptr ? thread->vertexArray() : 0;
+  host.trace().callback("vertexArray", "", std::to_string(name));
+  return name;
+}
+
+uint32_t createBuffer(HostContext context, uint32_t target, uint32_t sizeBytes, const void* data,
+                      uint32_t usage, uint32_t* out, int32_t) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("createBuffer");
+  GLuint buffer = 0;
+  glGenBuffers(1, &buffer);
+  glBindBuffer(target, buffer);
+  glBufferData(target, sizeBytes, data, usage);
+  glBindBuffer(target, 0);
+  if (out != nullptr) {
+    *out = buffer;
+  }
+  host.trace().callback("createBuffer",
+                        hex(target) + ", " + std::to_string(sizeBytes) + " bytes, " + hex(usage),
+                        std::to_string(buffer));
+  return buffer;
+}
+
+void releaseBuffer(HostContext context, uint32_t name) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("releaseBuffer");
+  glDeleteBuffers(1, &name);
+  host.trace().callback("releaseBuffer", std::to_string(name), "");
+}
+
 }  // namespace
 
 void installCallbacks(HostEffectRecord& record) {
@@ -423,6 +462,9 @@ void installCallbacks(HostEffectRecord& record) {
   record.defineSlider = defineSlider;
   record.defineControl = defineControl;
   record.redrawControl = redrawControl;
+  record.vertexArray = vertexArray;
+  record.createBuffer = createBuffer;
+  record.releaseBuffer = releaseBuffer;
 }
 
 }  // namespace vtpl::host

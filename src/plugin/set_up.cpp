@@ -2,16 +2,26 @@
 
 #include <cstdio>
 
+#include "gl/copy_pass.h"
+#include "gl/glew_setup.h"
+#include "gl/plugin_exception.h"
 #include "plugin/scopes_effect_data.h"
 
 namespace plugin::Scopes {
 
 void setUp(const Plugin::gl::HostCalls& host, ScopesEffectData& instance) {
-  if (host.record().verbose != 0) {
+  // Without a current context GLEW loads nothing, and every later GL call would jump through a
+  // null entry point: refuse instead.
+  if (!Plugin::gl::initialiseGlew()) {
+    throw Plugin::gl::PluginException(Plugin::gl::kPluginErrorText);
+  }
+  const bool verbose = host.record().verbose != 0;
+  if (verbose) {
     std::fputs("Waveform Plugin\n", stdout);
     std::fflush(stdout);
   }
   instance.instancedDrawing = true;
+  Plugin::gl::ensureCopyAndClearPrograms(instance, verbose);
 }
 
 }  // namespace plugin::Scopes

@@ -1,4 +1,5 @@
-// Message 8: prepares an instance for drawing once the host's GL context is current.
+// Message 8: loads the GL entry points and builds the instance's programs, with the host's
+// context current.
 #ifndef WAVEFORM_PLUGIN_SET_UP_H
 #define WAVEFORM_PLUGIN_SET_UP_H
 

@@ -94,11 +94,19 @@ TEST(Dispatch, SetUpPrintsTheBannerOnlyWhenVerbose) {
   for (const bool verbose : {false, true}) {
     vtpl::host::HostSettings settings = declaredStateSettings();
     settings.verbose = verbose;
-    auto host = openHost(settings);
+    settings.gl = true;
+    vtpl::host::EffectHost host(waveformModule(), settings);
     testing::internal::CaptureStdout();
-    EXPECT_EQ(host->send(vtpl::kMessageSetUp), 1);
-    EXPECT_EQ(testing::internal::GetCapturedStdout(), verbose ? "Waveform Plugin\n" : "");
+    host.open();                                   // ends with message 8
+    EXPECT_EQ(host.send(vtpl::kMessageSetUp), 1);  // set up twice builds nothing twice
+    EXPECT_EQ(testing::internal::GetCapturedStdout(),
+              verbose ? "Waveform Plugin\nWaveform Plugin\n" : "");
   }
+}
+
+TEST(Dispatch, SetUpWithoutAGlContextFailsInsteadOfCrashing) {
+  auto host = openHost();  // no GL threads: nothing is current
+  EXPECT_EQ(host->send(vtpl::kMessageSetUp), 5);
 }
 
 TEST(Dispatch, SetUpWithoutAnInstanceIsNotHandled) {

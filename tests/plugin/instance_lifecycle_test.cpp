@@ -65,7 +65,7 @@ TEST(InstanceLifecycle, AttachmentsFromTwoThreadsAreNotLost) {
   notify(nullptr, &record, vtpl::kMessageDestroySharedData);
 }
 
-TEST(InstanceLifecycle, InstanceStartsEmptyAndSetUpEnablesInstancedDrawing) {
+TEST(InstanceLifecycle, InstanceStartsEmpty) {
   vtpl::HostEffectRecord record{};
   ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateInstance), 1);
   ScopesEffectData* instance = instanceOf(record);
@@ -74,9 +74,7 @@ TEST(InstanceLifecycle, InstanceStartsEmptyAndSetUpEnablesInstancedDrawing) {
   EXPECT_TRUE(instance->stencilPool.empty());
   EXPECT_TRUE(instance->labelCache.empty());
   EXPECT_TRUE(instance->labelTextSettings.familyName.empty());
-
-  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageSetUp), 1);
-  EXPECT_TRUE(instance->instancedDrawing);
+  EXPECT_EQ(instance->programCount(), 0);
 
   EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroyInstance), 1);
   EXPECT_EQ(record.instance, nullptr);

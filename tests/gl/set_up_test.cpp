@@ -1,0 +1,31 @@
+// Message 8 with a context current: the instance's programs exist afterwards.
+#include <gtest/gtest.h>
+
+#include "gl/copy_pass.h"
+#include "gl_test_context.h"
+#include "plugin/instance_lifecycle.h"
+#include "plugin/notify.h"
+#include "plugin/scopes_effect_data.h"
+
+namespace waveform_test {
+namespace {
+
+using namespace plugin::Scopes;
+
+class SetUp : public GlTest {};
+
+TEST_F(SetUp, BuildsCopyAndClearAndEnablesInstancedDrawing) {
+  vtpl::HostEffectRecord record{};
+  ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateInstance), 1);
+  ScopesEffectData& instance = *instanceOf(record);
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageSetUp), 1);
+  EXPECT_TRUE(instance.instancedDrawing);
+  EXPECT_GE(instance.programId(Plugin::gl::kCopyProgram), 0);
+  EXPECT_GE(instance.programId(Plugin::gl::kClearProgram), 0);
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageSetUp), 1);
+  EXPECT_EQ(instance.programCount(), 2);
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroyInstance), 1);
+}
+
+}  // namespace
+}  // namespace waveform_test
