@@ -7,7 +7,7 @@
 namespace vtpl::host {
 namespace {
 
-const std::vector<std::string> kCommands = {"info", "help"};
+const std::vector<std::string> kCommands = {"info", "render", "help"};
 
 // The value of an option given as "--name=value" or as "--name value".
 std::string optionValue(const std::vector<std::string>& arguments, size_t& index,
@@ -48,6 +48,12 @@ CommandLine parseCommandLine(const std::vector<std::string>& arguments) {
       line.trace = true;
     } else if (argument == "--verbose") {
       line.verbose = true;
+    } else if (argument == "--float") {
+      line.asFloat = true;
+    } else if (argument == "--pad") {
+      line.pad = true;
+    } else if (argument == "-o" || isOption(argument, "--output")) {
+      line.output = optionValue(arguments, i, argument == "-o" ? "-o" : "--output");
     } else if (isOption(argument, "--plugin")) {
       line.plugin = optionValue(arguments, i, "--plugin");
     } else if (isOption(argument, "--host-version")) {
@@ -65,6 +71,8 @@ CommandLine parseCommandLine(const std::vector<std::string>& arguments) {
       throw UsageError("unknown option '" + argument + "'");
     } else if (line.command.empty()) {
       line.command = argument;
+    } else if (line.command == "render" && line.input.empty()) {
+      line.input = argument;
     } else {
       throw UsageError("unexpected argument '" + argument + "'");
     }
@@ -79,6 +87,9 @@ CommandLine parseCommandLine(const std::vector<std::string>& arguments) {
   if (!known) {
     throw UsageError("unknown command '" + line.command + "'");
   }
+  if (line.command == "render" && (line.input.empty() || line.output.empty())) {
+    throw UsageError("render needs an input picture and -o OUTPUT");
+  }
   return line;
 }
 
@@ -86,8 +97,9 @@ std::string usageText() {
   return R"(usage: vtpl-host COMMAND [options]
 
 commands:
-  info        print the plug-in's information and its parameter panel
-  help        print this text
+  info                      print the plug-in's information and its parameter panel
+  render IN.png -o OUT.png  render one frame of the picture through the effect
+  help                      print this text
 
 options:
   --plugin PATH        the effect module to load (default: plugins/scopes/Waveform.vtpl
@@ -100,6 +112,11 @@ options:
   --verbose            set the host's verbose flag
   --trace              log every message and callback, with arguments and results, to
                        standard error
+
+render options:
+  -o, --output PATH    the output picture (PNG, the input's bit depth)
+  --float              hold 8-bit pictures in float textures (16-bit ones always are)
+  --pad                allocate textures with power-of-two storage
 )";
 }
 

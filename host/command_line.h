@@ -20,7 +20,11 @@ class UsageError : public HostError {
 };
 
 struct CommandLine {
-  std::string command;           // "info" or "help"
+  std::string command;           // "info", "render" or "help"
+  std::filesystem::path input;   // render: the layer picture
+  std::filesystem::path output;  // render: where the output goes
+  bool asFloat = false;          // render: float storage for 8-bit pictures too
+  bool pad = false;              // render: power-of-two texture storage
   std::filesystem::path plugin;  // empty: the module built beside the tool
   bool trace = false;            // log every message and callback to standard error
   bool verbose = false;          // set the host record's verbose flag

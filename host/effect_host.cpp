@@ -2,16 +2,26 @@
 
 #include <GL/glew.h>
 
+#include <array>
 #include <stdexcept>
 
 #include "host_callbacks.h"
 #include "host_error.h"
+#include "layer_textures.h"
 
 namespace vtpl::host {
 
 namespace {
+
 constexpr char kParentLayerName[] = "Effect_Parent_Layer";
+// The identifier of the frames this host renders; not the all-zero form.
+constexpr char kRenderIdentifier[] = "5c0e1f2a-3b4c-4d5e-8f60-718293a4b5c6";
+
+std::array<float, 16> orthographic(float width, float height) {
+  return {2.0f / width, 0, 0, 0, 0, 2.0f / height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
 }
+
+}  // namespace
 
 EffectHost::EffectHost(const PluginModule& module, HostSettings settings, std::ostream* trace)
     : module_(module), settings_(std::move(settings)), trace_(trace) {
@@ -124,6 +134,65 @@ void EffectHost::setValueFromText(const std::string& id, const std::string& text
   store_.setFromText(id, text);
   expectHandled(kMessageParameterChanged, changeParameter(id), "react to '" + id + "'");
   expectHandled(kMessageParameterEdited, editParameter(id), "take the edit of '" + id + "'");
+}
+
+Image EffectHost::renderFrame(const Image& layer, bool asFloat) {
+  if (renderThread_ == nullptr) {
+    throw HostError("rendering needs a host with GL");
+  }
+  const bool floatStorage = asFloat || layer.bitDepth == 16;
+  HostTexture source{};
+  HostTexture destination{};
+  renderThread_->run([&] {
+    source = uploadLayer(layer, floatStorage, settings_.padTextures);
+    destination =
+        allocateLayerTexture(source.width, source.height, floatStorage, settings_.padTextures);
+  });
+  const std::array<float, 16> projection =
+      orthographic(static_cast<float>(layer.width), static_cast<float>(layer.height));
+  const std::array<float, 16> identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+  HostRenderRecord frame{};
+  frame.identifier = kRenderIdentifier;
+  frame.source = &source;
+  frame.destination = &destination;
+  frame.textureScale = 1.0f;
+  frame.renderScaleX = frame.renderScaleY = 1.0f;
+  frame.projection = projection.data();
+  frame.modelView = identity.data();
+  frame.frameWidth = layer.width;
+  frame.frameHeight = layer.height;
+  record_.messageRecord = &frame;
+  const int32_t result = send(kMessageRender);
+  record_.messageRecord = nullptr;
+
+  Image output;
+  renderThread_->run([&] {
+    output = readLayer(destination, layer.bitDepth);
+    deleteLayerTexture(source);
+    deleteLayerTexture(destination);
+    for (HostTexture& texture : workingTextures_) {
+      deleteLayerTexture(texture);
+    }
+    workingTextures_.clear();
+  });
+  expectHandled(kMessageRender, result, "render the frame");
+  return output;
+}
+
+HostTexture EffectHost::allocateWorkingTexture(uint32_t width, uint32_t height, bool asFloat) {
+  workingTextures_.push_back(allocateLayerTexture(width, height, asFloat, settings_.padTextures));
+  return workingTextures_.back();
+}
+
+bool EffectHost::releaseWorkingTexture(uint32_t name) {
+  for (auto texture = workingTextures_.begin(); texture != workingTextures_.end(); ++texture) {
+    if (texture->name == name) {
+      deleteLayerTexture(*texture);
+      workingTextures_.erase(texture);
+      return true;
+    }
+  }
+  return false;
 }
 
 void EffectHost::expectHandled(int32_t message, int32_t result, const std::string& what) {

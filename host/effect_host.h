@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "gl_thread.h"
+#include "image.h"
 #include "parameter_store.h"
 #include "plugin_module.h"
 #include "trace_log.h"
@@ -29,6 +30,8 @@ struct HostSettings {
   // 1003 on the interface thread, all others on the render thread), and send message 8 when
   // opening. Without it messages run on the caller's thread and no GL is needed.
   bool gl = false;
+  // Allocate layer and working textures with power-of-two storage instead of exact sizes.
+  bool padTextures = false;
 };
 
 // Faults the host commits on request, so tests can see how an effect copes with a bad host.
@@ -37,6 +40,7 @@ struct HostFaults {
   std::string throwInCallback;    // throw from the callback of this name (as the trace names it)
   bool throwNonStandard = false;  // throw an int instead of a std::runtime_error
   bool failLayerInfo = false;     // getLayerInfo answers with a failure status
+  int stopAtProgress = -1;        // progress asks to stop from this many steps done on
 };
 
 // A layer the host can report to the effect (message 7 with "Effect_Parent_Layer").
@@ -68,6 +72,9 @@ class EffectHost {
   int32_t changeParentLayer(int32_t width, int32_t height);
   // A user's edit: the value from text, then messages 7 and 13. Throws HostError.
   void setValueFromText(const std::string& id, const std::string& text);
+  // Message 10 for one frame of `layer` (8-bit storage, or float storage when asked or when the
+  // picture has 16 bits); returns the output, read back. Needs GL. Throws HostError.
+  Image renderFrame(const Image& layer, bool asFloat = false);
 
   HostEffectRecord& record() { return record_; }
   ParameterStore& parameters() { return store_; }
@@ -86,6 +93,9 @@ class EffectHost {
   void noteUnknownId(const char* id);
   void noteRedraw() { ++redrawRequests_; }
   const HostLayer* findLayer(const void* handle) const;
+  // Working textures allocated for the effect, handed back with releaseLayer or after the frame.
+  HostTexture allocateWorkingTexture(uint32_t width, uint32_t height, bool asFloat);
+  bool releaseWorkingTexture(uint32_t name);
 
  private:
   int32_t sendWithDetail(int32_t message, const std::string& detail);
@@ -106,6 +116,7 @@ class EffectHost {
   int declarationsSeen_ = 0;
   int redrawRequests_ = 0;
   int callbackCount_ = 0;
+  std::vector<HostTexture> workingTextures_;
   std::unique_ptr<GlThread> renderThread_;
   std::unique_ptr<GlThread> interfaceThread_;
 };

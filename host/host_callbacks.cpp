@@ -386,8 +386,11 @@ void setInt(HostContext context, const char* id, int32_t time, int32_t value, in
 int32_t progress(HostContext context, int32_t done, int32_t total) {
   EffectHost& host = hostOf(context);
   host.enterCallback("progress");
-  host.trace().callback("progress", std::to_string(done) + "/" + std::to_string(total), "0");
-  return 0;
+  const int stopAt = host.faults().stopAtProgress;
+  const int32_t stop = stopAt >= 0 && done >= stopAt ? 1 : 0;
+  host.trace().callback("progress", std::to_string(done) + "/" + std::to_string(total),
+                        std::to_string(stop));
+  return stop;
 }
 
 void redrawControl(HostContext context, const char* id) {
@@ -433,6 +436,36 @@ void releaseBuffer(HostContext context, uint32_t name) {
   host.trace().callback("releaseBuffer", std::to_string(name), "");
 }
 
+uint32_t allocateTexture(HostContext context, const HostRenderRecord*, uint32_t width,
+                         uint32_t height, uint32_t internalFormat, uint32_t format,
+                         uint32_t pixelType, uint32_t, uint32_t, uint32_t* allocatedWidth,
+                         uint32_t* allocatedHeight, uint8_t flag) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("allocateTexture");
+  const HostTexture texture = host.allocateWorkingTexture(
+      width, height, internalFormat != GL_RGBA && internalFormat != GL_RGBA8);
+  if (allocatedWidth != nullptr) {
+    *allocatedWidth = texture.allocatedWidth;
+  }
+  if (allocatedHeight != nullptr) {
+    *allocatedHeight = texture.allocatedHeight;
+  }
+  host.trace().callback(
+      "allocateTexture",
+      std::to_string(width) + "x" + std::to_string(height) + ", " + hex(internalFormat) + ", " +
+          hex(format) + ", " + hex(pixelType) + ", flag " + std::to_string(flag),
+      std::to_string(texture.name) + " (" + std::to_string(texture.allocatedWidth) + "x" +
+          std::to_string(texture.allocatedHeight) + ")");
+  return texture.name;
+}
+
+void releaseLayer(HostContext context, const void*, uint32_t textureName) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("releaseLayer");
+  host.releaseWorkingTexture(textureName);
+  host.trace().callback("releaseLayer", std::to_string(textureName), "");
+}
+
 }  // namespace
 
 void installCallbacks(HostEffectRecord& record) {
@@ -462,6 +495,8 @@ void installCallbacks(HostEffectRecord& record) {
   record.defineSlider = defineSlider;
   record.defineControl = defineControl;
   record.redrawControl = redrawControl;
+  record.allocateTexture = allocateTexture;
+  record.releaseLayer = releaseLayer;
   record.vertexArray = vertexArray;
   record.createBuffer = createBuffer;
   record.releaseBuffer = releaseBuffer;

@@ -5,6 +5,7 @@
 
 #include "command_line.h"
 #include "effect_host.h"
+#include "image.h"
 #include "panel_printer.h"
 #include "plugin_module.h"
 #include "utf16_text.h"
@@ -58,6 +59,21 @@ int runInfo(const CommandLine& line, const PluginModule& module) {
   return 0;
 }
 
+int runRender(const CommandLine& line, const PluginModule& module) {
+  const Image layer = readPng(line.input);
+  HostSettings settings = settingsFrom(line);
+  settings.gl = true;
+  settings.padTextures = line.pad;
+  EffectHost host(module, settings, line.trace ? &std::cerr : nullptr);
+  host.open();
+  for (const auto& [id, value] : line.settings) {
+    host.setValueFromText(id, value);
+  }
+  writePng(line.output, host.renderFrame(layer, line.asFloat));
+  warnAboutUnknownIds(host);
+  return 0;
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -68,7 +84,7 @@ int main(int argc, char** argv) {
       return 0;
     }
     const PluginModule module(line.plugin.empty() ? defaultPluginPath() : line.plugin);
-    return runInfo(line, module);
+    return line.command == "render" ? runRender(line, module) : runInfo(line, module);
   } catch (const UsageError& error) {
     std::cerr << "vtpl-host: " << error.what() << "\n\n" << usageText();
     return 2;

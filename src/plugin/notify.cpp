@@ -5,6 +5,7 @@
 #include "plugin/parameter_declarations.h"
 #include "plugin/parameter_reactions.h"
 #include "plugin/plugin_info.h"
+#include "plugin/render.h"
 #include "plugin/set_up.h"
 
 namespace plugin::Scopes {
@@ -43,8 +44,10 @@ int32_t handleMessage(HostContext context, HostEffectRecord& record, int32_t mes
       setUp(host, *instanceOf(record));
       return kResultHandled;
     case kMessageRender:
-      // Nothing is drawn yet: the output is left as the host gave it.
-      return kResultHandled;
+      if (instanceOf(record) == nullptr) {
+        return kResultNotHandled;
+      }
+      return render(host, *instanceOf(record));
     case kMessageParameterEdited:
     case kMessageParameterEditedAlt:
       parameterEdited(host, changedParameterId(record));
