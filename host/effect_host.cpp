@@ -141,6 +141,8 @@ Image EffectHost::renderFrame(const Image& layer, bool asFloat) {
     throw HostError("rendering needs a host with GL");
   }
   const bool floatStorage = asFloat || layer.bitDepth == 16;
+  ownLayer_ = layer;
+  ownLayerIsFloat_ = floatStorage;
   HostTexture source{};
   HostTexture destination{};
   renderThread_->run([&] {
@@ -181,6 +183,14 @@ Image EffectHost::renderFrame(const Image& layer, bool asFloat) {
 
 HostTexture EffectHost::allocateWorkingTexture(uint32_t width, uint32_t height, bool asFloat) {
   workingTextures_.push_back(allocateLayerTexture(width, height, asFloat, settings_.padTextures));
+  return workingTextures_.back();
+}
+
+HostTexture EffectHost::fetchOwnLayer(int32_t frameIndex) {
+  if (frameIndex != 0 || ownLayer_.rgba.empty()) {
+    return HostTexture{};
+  }
+  workingTextures_.push_back(uploadLayer(ownLayer_, ownLayerIsFloat_, settings_.padTextures));
   return workingTextures_.back();
 }
 

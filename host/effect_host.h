@@ -95,6 +95,9 @@ class EffectHost {
   const HostLayer* findLayer(const void* handle) const;
   // Working textures allocated for the effect, handed back with releaseLayer or after the frame.
   HostTexture allocateWorkingTexture(uint32_t width, uint32_t height, bool asFloat);
+  // The effect's own layer at a frame index, uploaded into the calling thread's context; a
+  // texture name of 0 when the host has no such frame. Released like working textures.
+  HostTexture fetchOwnLayer(int32_t frameIndex);
   bool releaseWorkingTexture(uint32_t name);
 
  private:
@@ -117,6 +120,8 @@ class EffectHost {
   int redrawRequests_ = 0;
   int callbackCount_ = 0;
   std::vector<HostTexture> workingTextures_;
+  Image ownLayer_;  // the picture of the frame last rendered (frame index 0)
+  bool ownLayerIsFloat_ = false;
   std::unique_ptr<GlThread> renderThread_;
   std::unique_ptr<GlThread> interfaceThread_;
 };

@@ -459,6 +459,17 @@ uint32_t allocateTexture(HostContext context, const HostRenderRecord*, uint32_t 
   return texture.name;
 }
 
+void fetchOwnLayer(HostContext context, int32_t, int32_t frameIndex, HostTexture* out) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("fetchOwnLayer");
+  const HostTexture texture = host.fetchOwnLayer(frameIndex);
+  if (out != nullptr) {
+    *out = texture;
+  }
+  host.trace().callback("fetchOwnLayer", "frame " + std::to_string(frameIndex),
+                        std::to_string(texture.name));
+}
+
 void releaseLayer(HostContext context, const void*, uint32_t textureName) {
   EffectHost& host = hostOf(context);
   host.enterCallback("releaseLayer");
@@ -496,6 +507,7 @@ void installCallbacks(HostEffectRecord& record) {
   record.defineControl = defineControl;
   record.redrawControl = redrawControl;
   record.allocateTexture = allocateTexture;
+  record.fetchOwnLayer = fetchOwnLayer;
   record.releaseLayer = releaseLayer;
   record.vertexArray = vertexArray;
   record.createBuffer = createBuffer;

@@ -8,7 +8,9 @@
 #include <random>
 #include <string>
 
+#include "gl_thread.h"
 #include "image.h"
+#include "layer_textures.h"
 #include "waveform_module.h"
 
 namespace waveform_test {
@@ -88,6 +90,29 @@ TEST(Render, StoppedRenderStillCopiesTheLayer) {
     host->faults().stopAtProgress = stopAt;
     expectSamePicture(host->renderFrame(input), input, 1e-6f);
   }
+}
+
+TEST(Render, OwnLayerIsFetchedForTheRenderedFrameOnly) {
+  auto host = openHost(glSettings(true));
+  const Image input = randomPicture(10, 6, 8, 13);
+  host->renderFrame(input);
+  const vtpl::HostEffectRecord& record = host->record();
+  vtpl::HostTexture own{};
+  vtpl::HostTexture missing{};
+  missing.name = 99;
+  Image fetched;
+  vtpl::host::GlThread other("interface");
+  other.run([&] {
+    record.fetchOwnLayer(host.get(), 0, 0, &own);
+    record.fetchOwnLayer(host.get(), 0, 1, &missing);
+    fetched = vtpl::host::readLayer(own, 8);
+    record.releaseLayer(host.get(), nullptr, own.name);
+  });
+  EXPECT_NE(own.name, 0u);
+  EXPECT_EQ(own.allocatedWidth, 16u);  // padded storage
+  EXPECT_EQ(own.uMax, 10.0f / 16.0f);
+  EXPECT_EQ(missing.name, 0u);
+  expectSamePicture(fetched, input, 1e-6f);
 }
 
 TEST(Render, ToolRendersAPictureFile) {
