@@ -4,6 +4,8 @@
 #include <EGL/eglext.h>
 #include <GL/glew.h>
 
+#include <cstring>
+
 #include "host_error.h"
 
 namespace vtpl::host {
@@ -17,8 +19,38 @@ struct Display {
   std::string error;
 };
 
-// Mesa's surfaceless platform on machines without a GPU; the device platform where a GPU driver
-// provides one. Opened once per process.
+// The first GPU that EGL lists as a device, if any: Mesa lists its software renderer as a device
+// too, marked by its own extension, and that one is left to the surfaceless platform.
+EGLDisplay hardwareDeviceDisplay(PFNEGLGETPLATFORMDISPLAYEXTPROC getPlatformDisplay) {
+  const auto queryDevices =
+      reinterpret_cast<PFNEGLQUERYDEVICESEXTPROC>(eglGetProcAddress("eglQueryDevicesEXT"));
+  const auto queryDeviceString = reinterpret_cast<PFNEGLQUERYDEVICESTRINGEXTPROC>(
+      eglGetProcAddress("eglQueryDeviceStringEXT"));
+  if (queryDevices == nullptr || queryDeviceString == nullptr) {
+    return EGL_NO_DISPLAY;
+  }
+  EGLDeviceEXT devices[16];
+  EGLint count = 0;
+  if (!queryDevices(16, devices, &count)) {
+    return EGL_NO_DISPLAY;
+  }
+  for (EGLint i = 0; i < count; ++i) {
+    const char* extensions = queryDeviceString(devices[i], EGL_EXTENSIONS);
+    if (extensions != nullptr && std::strstr(extensions, "EGL_MESA_device_software") != nullptr) {
+      continue;
+    }
+    EGLDisplay display = getPlatformDisplay(EGL_PLATFORM_DEVICE_EXT, devices[i], nullptr);
+    EGLint major = 0, minor = 0;
+    if (display != EGL_NO_DISPLAY && eglInitialize(display, &major, &minor)) {
+      return display;
+    }
+  }
+  return EGL_NO_DISPLAY;
+}
+
+// A GPU through the EGL device platform where a driver provides one; otherwise Mesa's
+// surfaceless platform (the software renderer on machines without a GPU). Opened once per
+// process.
 const Display& display() {
   static const Display opened = [] {
     Display result;
@@ -28,21 +60,13 @@ const Display& display() {
       result.error = "EGL cannot open platform displays";
       return result;
     }
-    EGLint major = 0, minor = 0;
-    result.display =
-        getPlatformDisplay(EGL_PLATFORM_SURFACELESS_MESA, EGL_DEFAULT_DISPLAY, nullptr);
-    if (result.display == EGL_NO_DISPLAY || !eglInitialize(result.display, &major, &minor)) {
-      const auto queryDevices =
-          reinterpret_cast<PFNEGLQUERYDEVICESEXTPROC>(eglGetProcAddress("eglQueryDevicesEXT"));
-      EGLDeviceEXT device = nullptr;
-      EGLint count = 0;
-      if (queryDevices == nullptr || !queryDevices(1, &device, &count) || count == 0) {
-        result.error = "no headless EGL display (surfaceless or device)";
-        return result;
-      }
-      result.display = getPlatformDisplay(EGL_PLATFORM_DEVICE_EXT, device, nullptr);
+    result.display = hardwareDeviceDisplay(getPlatformDisplay);
+    if (result.display == EGL_NO_DISPLAY) {
+      EGLint major = 0, minor = 0;
+      result.display =
+          getPlatformDisplay(EGL_PLATFORM_SURFACELESS_MESA, EGL_DEFAULT_DISPLAY, nullptr);
       if (result.display == EGL_NO_DISPLAY || !eglInitialize(result.display, &major, &minor)) {
-        result.error = "cannot initialise the EGL device display";
+        result.error = "no headless EGL display (GPU device or surfaceless)";
         return result;
       }
     }
