@@ -1,6 +1,6 @@
-// A headless OpenGL 4.1 core context for GL tests: Mesa's surfaceless EGL platform, made current
-// on the test thread, with GLEW initialised. Under CI a missing GL fails the test; elsewhere the
-// test is skipped with the reason.
+// A headless OpenGL 4.1 core context for GL tests, made as the host makes its own (Mesa's
+// software renderer on machines without a GPU), current on the test thread with GLEW loaded.
+// Under CI a missing GL fails the test; elsewhere the test is skipped with the reason.
 #ifndef WAVEFORM_TESTS_GL_GL_TEST_CONTEXT_H
 #define WAVEFORM_TESTS_GL_GL_TEST_CONTEXT_H
 
