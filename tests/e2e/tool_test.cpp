@@ -9,6 +9,8 @@
 #include <string>
 #include <vector>
 
+#include "image.h"
+
 namespace waveform_test {
 namespace {
 
@@ -26,12 +28,14 @@ std::string shellQuoted(const std::string& text) {
   return quoted + "'";
 }
 
-// Runs the tool from `folder` when one is given.
-ToolRun runTool(const std::vector<std::string>& arguments, const std::string& folder = "") {
+// Runs the tool from `folder` when one is given, with `environment` ("NAME=value ...") added.
+ToolRun runTool(const std::vector<std::string>& arguments, const std::string& folder = "",
+                const std::string& environment = "") {
   char errPath[] = "/tmp/vtpl-host-test-XXXXXX";
   const int errFile = mkstemp(errPath);
   EXPECT_GE(errFile, 0);
   std::string command = folder.empty() ? "" : "cd " + shellQuoted(folder) + " && ";
+  command += environment.empty() ? "" : "env " + environment + " ";
   command += shellQuoted(VTPL_HOST_TOOL_PATH);
   for (const std::string& argument : arguments) {
     command += " " + shellQuoted(argument);
@@ -176,6 +180,30 @@ TEST(Tool, PluginPathWithoutFolderIsTheFileInTheCurrentFolder) {
       runTool({"info", "--plugin", module.substr(slash + 1)}, module.substr(0, slash));
   EXPECT_EQ(run.exitCode, 0) << run.err;
   EXPECT_NE(run.out.find("Parameters (25)"), std::string::npos);
+}
+
+// Mesa can be told to offer GLSL 4.00 only: the effect's "#version 410" programs then fail to
+// compile, message 8 answers 5 through the module, and the driver's log is echoed when verbose.
+TEST(Tool, DriverWithoutGlsl410FailsSetUpWithAResult) {
+  const std::string picture = testing::TempDir() + "/tool_glsl_in.png";
+  vtpl::host::Image image;
+  image.width = image.height = 2;
+  image.rgba.assign(16, 1.0f);
+  vtpl::host::writePng(picture, image);
+  const std::string oldGlsl = "MESA_GL_VERSION_OVERRIDE=4.1 MESA_GLSL_VERSION_OVERRIDE=400";
+  for (const bool verbose : {false, true}) {
+    std::vector<std::string> arguments = {"render", picture, "-o", picture + ".out.png"};
+    if (verbose) {
+      arguments.push_back("--verbose");
+    }
+    const ToolRun run = runTool(arguments, "", oldGlsl);
+    EXPECT_EQ(run.exitCode, 1);
+    EXPECT_NE(run.err.find("failed to set up its GL programs (Notify 8 returned 5)"),
+              std::string::npos)
+        << run.err;
+    EXPECT_EQ(run.out.find("error") != std::string::npos, verbose) << run.out;
+  }
+  std::remove(picture.c_str());
 }
 
 TEST(Tool, HelpPrintsUsage) {
