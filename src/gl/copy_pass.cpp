@@ -81,12 +81,10 @@ void copyPass(const HostCalls& host, EffectData& programs, const vtpl::HostTextu
                             render->modelView);
 
   // The quad spans the frame; its texture coordinates are the used area of the source.
-  const float w = static_cast<float>(render->frameWidth);
-  const float h = static_cast<float>(render->frameHeight);
-  const float quad[16] = {0, 0, source.uMin, source.vMin, w, 0, source.uMax, source.vMin,
-                          0, h, source.uMin, source.vMax, w, h, source.uMax, source.vMax};
+  const QuadVertices quad = textureQuad(source, static_cast<GLuint>(render->frameWidth),
+                                        static_cast<GLuint>(render->frameHeight));
   bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, source.name, true);
-  drawQuadArrays(host, quad, 4, GL_TRIANGLE_STRIP);
+  drawQuadArrays(host, quad.data(), 4, GL_TRIANGLE_STRIP);
 
   // Leave the frame's own textures in place for the stage that follows.
   if (render->destination != nullptr) {
