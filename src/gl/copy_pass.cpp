@@ -4,23 +4,12 @@
 
 #include "gl/host_textures.h"
 #include "gl/plugin_exception.h"
+#include "gl/textured_quad_program.h"
 #include "gl/vertex_attributes.h"
 #include "gl/vertex_buffer.h"
 
 namespace Plugin::gl {
 namespace {
-
-const std::string kCopyVertexSource = R"(#version 410
-in vec4 vertexPosition;
-in vec2 vertexTexCoord;
-uniform mat4 projectionMatrix;
-uniform mat4 modelViewMatrix;
-out vec2 texCoord;
-void main() {
-  texCoord = vertexTexCoord;
-  gl_Position = projectionMatrix * modelViewMatrix * vertexPosition;
-}
-)";
 
 const std::string kCopyFragmentSource = R"(#version 410
 uniform sampler2D sourceTexture;
@@ -49,9 +38,6 @@ void main() {
 }
 )";
 
-constexpr char kProjectionUniform[] = "projectionMatrix";
-constexpr char kModelViewUniform[] = "modelViewMatrix";
-
 }  // namespace
 
 void ensureCopyAndClearPrograms(EffectData& programs, bool echo) {
@@ -63,7 +49,8 @@ void ensureCopyAndClearPrograms(EffectData& programs, bool echo) {
     }
   }
   if (programs.programId(kCopyProgram) < 0) {
-    programs.createProgram(kCopyVertexSource, kCopyFragmentSource, echo, kCopyProgram, true, true);
+    programs.createProgram(kTexturedQuadVertexSource, kCopyFragmentSource, echo, kCopyProgram, true,
+                           true);
   }
 }
 

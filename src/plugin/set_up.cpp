@@ -6,6 +6,7 @@
 #include "gl/glew_setup.h"
 #include "gl/plugin_exception.h"
 #include "plugin/scopes_effect_data.h"
+#include "scope/waveform_display.h"
 
 namespace plugin::Scopes {
 
@@ -21,6 +22,7 @@ void setUp(const Plugin::gl::HostCalls& host, ScopesEffectData& instance) {
     std::fflush(stdout);
   }
   instance.instancedDrawing = true;
+  ensureWaveformDisplayPrograms(instance, verbose);
   Plugin::gl::ensureCopyAndClearPrograms(instance, verbose);
 }
 

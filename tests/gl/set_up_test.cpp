@@ -6,6 +6,7 @@
 #include "plugin/instance_lifecycle.h"
 #include "plugin/notify.h"
 #include "plugin/scopes_effect_data.h"
+#include "scope/waveform_display.h"
 
 namespace waveform_test {
 namespace {
@@ -14,7 +15,7 @@ using namespace plugin::Scopes;
 
 class SetUp : public GlTest {};
 
-TEST_F(SetUp, BuildsCopyAndClearAndEnablesInstancedDrawing) {
+TEST_F(SetUp, BuildsTheProgramsOnceAndEnablesInstancedDrawing) {
   vtpl::HostEffectRecord record{};
   ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateInstance), 1);
   ScopesEffectData& instance = *instanceOf(record);
@@ -22,8 +23,10 @@ TEST_F(SetUp, BuildsCopyAndClearAndEnablesInstancedDrawing) {
   EXPECT_TRUE(instance.instancedDrawing);
   EXPECT_GE(instance.programId(Plugin::gl::kCopyProgram), 0);
   EXPECT_GE(instance.programId(Plugin::gl::kClearProgram), 0);
+  EXPECT_GE(instance.programId(kCopyWaveformProgram), 0);
+  EXPECT_GE(instance.programId(kFillWaveformBackgroundProgram), 0);
   EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageSetUp), 1);
-  EXPECT_EQ(instance.programCount(), 2);
+  EXPECT_EQ(instance.programCount(), 4);
   EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroyInstance), 1);
 }
 

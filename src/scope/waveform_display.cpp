@@ -1,0 +1,133 @@
+#include "scope/waveform_display.h"
+
+#include <cstdio>
+
+#include "gl/plugin_exception.h"
+#include "gl/textured_quad_program.h"
+#include "gl/vertex_buffer.h"
+#include "scope/colour_space.h"
+#include "scope/parameter_choices.h"
+
+namespace plugin::Scopes {
+namespace {
+
+using Plugin::gl::EffectData;
+
+constexpr char kWaveformSampler[] = "waveformTexture";
+constexpr char kDisplayIndexUniform[] = "displayIndex";
+
+// A GLSL mat3 that multiplies like `rows`: GLSL's constructor takes columns.
+std::string glslMatrix(const Matrix3& rows) {
+  std::string text = "mat3(";
+  for (size_t column = 0; column < 3; ++column) {
+    for (size_t row = 0; row < 3; ++row) {
+      char value[40];
+      std::snprintf(value, sizeof value, "%.17g", rows[row][column]);
+      text += value;
+      text += column == 2 && row == 2 ? ")" : ", ";
+    }
+  }
+  return text;
+}
+
+std::string buildFragmentSource() {
+  const ColourSpaceMatrices& rec2020 = *colourSpaceMatrices(kRec2020);
+  return std::string(R"(#version 410
+uniform sampler2D waveformTexture;
+uniform int displayIndex;
+in vec2 texCoord;
+layout(location = 0) out vec4 fragColour;
+const mat3 toYCbCr = )") +
+         glslMatrix(rec2020.toYCbCr) + ";\nconst mat3 toRgb = " + glslMatrix(rec2020.toRgb) +
+         R"(;
+
+// One channel's trace in its own hue: faint values fade towards grey, values above half move
+// towards white, reaching it at 1.
+vec3 tintedTrace(vec3 tint, float x) {
+  vec3 trace = toYCbCr * tint;
+  vec3 white = toYCbCr * vec3(1.0);
+  trace.x = x;
+  trace.yz *= clamp(2.0 * x, 0.0, 1.0);
+  trace.yz = mix(trace.yz, white.yz, clamp((x - 0.5) * 2.0, 0.0, 1.0));
+  return toRgb * trace;
+}
+
+void main() {
+  vec4 w = texture(waveformTexture, texCoord);
+  vec3 colour = w.rgb;
+  if (displayIndex == 1) {
+    colour = vec3(w.r);
+  } else if (displayIndex == 2) {
+    colour = vec3(w.g);
+  } else if (displayIndex == 3) {
+    colour = vec3(w.b);
+  } else if (displayIndex == 4) {
+    colour = vec3(w.b, 0.0, w.g);
+  } else if (displayIndex == 5) {
+    colour = vec3((w.r + w.g + w.b) * 0.3333);
+  } else if (displayIndex == 6) {
+    colour = tintedTrace(vec3(1.0, 0.0, 0.0), w.r);
+  } else if (displayIndex == 7) {
+    colour = tintedTrace(vec3(0.0, 1.0, 0.0), w.g);
+  } else if (displayIndex == 8) {
+    colour = tintedTrace(vec3(0.0, 0.0, 1.0), w.b);
+  }
+  // Empty parts of the waveform stay transparent over the scope's background.
+  fragColour = vec4(colour, min(max(colour.r, max(colour.g, colour.b)), 1.0));
+}
+)";
+}
+
+const char kFillFragmentSource[] = R"(#version 410
+uniform vec4 fillColour;
+in vec2 texCoord;
+layout(location = 0) out vec4 fragColour;
+void main() {
+  fragColour = fillColour;
+}
+)";
+
+void createQuadProgram(EffectData& programs, const std::string& fragmentSource, bool echo,
+                       const char* name) {
+  if (programs.programId(name) >= 0) {
+    return;
+  }
+  if (programs.createProgram(Plugin::gl::kTexturedQuadVertexSource, fragmentSource, echo, name,
+                             true, true) != vtpl::kResultHandled) {
+    throw Plugin::gl::PluginException(Plugin::gl::kUnableToLinkShaderText);
+  }
+}
+
+}  // namespace
+
+const std::string& waveformDisplayFragmentSource() {
+  static const std::string source = buildFragmentSource();
+  return source;
+}
+
+void ensureWaveformDisplayPrograms(EffectData& programs, bool echo) {
+  createQuadProgram(programs, waveformDisplayFragmentSource(), echo, kCopyWaveformProgram);
+  createQuadProgram(programs, kFillFragmentSource, echo, kFillWaveformBackgroundProgram);
+}
+
+void drawWaveformDisplay(const Plugin::gl::HostCalls& host, EffectData& programs,
+                         GLuint waveformTexture, const Rectangle& destination,
+                         DisplayIndex displayIndex, const Plugin::gl::Matrix4& projection,
+                         const Plugin::gl::Matrix4& modelView) {
+  programs.useProgram(kCopyWaveformProgram);
+  programs.setUniformMatrix(programs.uniformLocation(Plugin::gl::kProjectionUniform), 4, 1, false,
+                            projection.data());
+  programs.setUniformMatrix(programs.uniformLocation(Plugin::gl::kModelViewUniform), 4, 1, false,
+                            modelView.data());
+  programs.setUniform1i(programs.uniformLocation(kWaveformSampler), 0);
+  programs.setUniform1i(programs.uniformLocation(kDisplayIndexUniform), displayIndex);
+  const Rectangle& d = destination;
+  const float quad[16] = {d.left, d.bottom, 0, 0, d.right, d.bottom, 1, 0,
+                          d.left, d.top,    0, 1, d.right, d.top,    1, 1};
+  Plugin::gl::bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, waveformTexture, true);
+  Plugin::gl::drawQuadArrays(host, quad, 4, GL_TRIANGLE_STRIP);
+  Plugin::gl::unbindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, false);
+  programs.releaseProgram();
+}
+
+}  // namespace plugin::Scopes

@@ -1,0 +1,38 @@
+// Turning a waveform texture into visible traces: the "copyWaveform" display program, the
+// "fillWaveformBackground" program, and the pass that draws a waveform into a rectangle.
+#ifndef WAVEFORM_SCOPE_WAVEFORM_DISPLAY_H
+#define WAVEFORM_SCOPE_WAVEFORM_DISPLAY_H
+
+#include <string>
+
+#include "gl/effect_data.h"
+#include "gl/host_calls.h"
+#include "gl/host_textures.h"
+#include "scope/channel_modes.h"
+
+namespace plugin::Scopes {
+
+inline constexpr char kCopyWaveformProgram[] = "copyWaveform";
+inline constexpr char kFillWaveformBackgroundProgram[] = "fillWaveformBackground";
+
+// The fragment stage of "copyWaveform", with the Rec. 2020 conversions of its tinted traces.
+const std::string& waveformDisplayFragmentSource();
+
+// Builds whichever of the two programs the registry lacks; a link failure raises
+// PluginException "Unable to link shader".
+void ensureWaveformDisplayPrograms(Plugin::gl::EffectData& programs, bool echo);
+
+struct Rectangle {
+  float left, bottom, right, top;
+};
+
+// Draws the whole waveform texture over `destination` with the display index's colours, into the
+// bound framebuffer. Blending is the caller's.
+void drawWaveformDisplay(const Plugin::gl::HostCalls& host, Plugin::gl::EffectData& programs,
+                         GLuint waveformTexture, const Rectangle& destination,
+                         DisplayIndex displayIndex, const Plugin::gl::Matrix4& projection,
+                         const Plugin::gl::Matrix4& modelView);
+
+}  // namespace plugin::Scopes
+
+#endif  // WAVEFORM_SCOPE_WAVEFORM_DISPLAY_H

@@ -1,0 +1,116 @@
+// The "copyWaveform" display program: what each display index makes of stored traces.
+#include <gtest/gtest.h>
+
+#include <array>
+#include <vector>
+
+#include "gl/framebuffer.h"
+#include "gl_test_context.h"
+#include "gl_test_host.h"
+#include "scope/waveform_display.h"
+
+namespace waveform_test {
+namespace {
+
+using namespace plugin::Scopes;
+using Pixel = std::array<float, 4>;
+
+class WaveformDisplay : public GlTest {};
+
+// Draws a one-row waveform of `stored` texels 1:1 into a float target and reads it back.
+std::vector<Pixel> display(const std::vector<Pixel>& stored, DisplayIndex index) {
+  const auto width = static_cast<GLsizei>(stored.size());
+  GLuint textures[2] = {};
+  glGenTextures(2, textures);
+  glBindTexture(GL_TEXTURE_2D, textures[0]);
+  glTexImage2D(GL_TEXTURE_2D, 0, GL_RGBA32F, width, 1, 0, GL_RGBA, GL_FLOAT, stored.data());
+  glBindTexture(GL_TEXTURE_2D, textures[1]);
+  glTexImage2D(GL_TEXTURE_2D, 0, GL_RGBA32F, width, 1, 0, GL_RGBA, GL_FLOAT, nullptr);
+  const Plugin::gl::FBO framebuffer;
+  glBindFramebuffer(GL_FRAMEBUFFER, framebuffer.name());
+  glFramebufferTexture2D(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D, textures[1], 0);
+  glViewport(0, 0, width, 1);
+
+  GlTestHost host;
+  Plugin::gl::EffectData programs;
+  ensureWaveformDisplayPrograms(programs, false);
+  const float w = static_cast<float>(width);
+  const Plugin::gl::Matrix4 projection = {2 / w, 0, 0, 0, 0, 2, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
+  const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+  drawWaveformDisplay(host.calls(), programs, textures[0], {0, 0, w, 1}, index, projection,
+                      identity);
+
+  std::vector<Pixel> shown(stored.size());
+  glReadPixels(0, 0, width, 1, GL_RGBA, GL_FLOAT, shown.data());
+  glBindFramebuffer(GL_FRAMEBUFFER, 0);
+  glDeleteTextures(2, textures);
+  return shown;
+}
+
+void expectPixel(const Pixel& actual, const Pixel& expected, const std::string& where) {
+  for (size_t c = 0; c < 4; ++c) {
+    EXPECT_NEAR(actual[c], expected[c], 1e-4) << where << " channel " << c;
+  }
+}
+
+const std::vector<Pixel> kStored = {
+    {0, 0, 0, 0}, {0.2f, 0.4f, 0.6f, 1}, {0.9f, 0.1f, 0.3f, 1}, {1.5f, 0.25f, 0.5f, 1}};
+
+TEST_F(WaveformDisplay, ChannelSelectionsAndGreys) {
+  const auto withAlpha = [](float r, float g, float b) {
+    return Pixel{r, g, b, std::min(std::max(r, std::max(g, b)), 1.0f)};
+  };
+  const std::vector<std::pair<int32_t, std::vector<Pixel>>> cases = {
+      {0,
+       {withAlpha(0, 0, 0), withAlpha(0.2f, 0.4f, 0.6f), withAlpha(0.9f, 0.1f, 0.3f),
+        withAlpha(1.5f, 0.25f, 0.5f)}},
+      {1,
+       {withAlpha(0, 0, 0), withAlpha(0.2f, 0.2f, 0.2f), withAlpha(0.9f, 0.9f, 0.9f),
+        withAlpha(1.5f, 1.5f, 1.5f)}},
+      {2,
+       {withAlpha(0, 0, 0), withAlpha(0.4f, 0.4f, 0.4f), withAlpha(0.1f, 0.1f, 0.1f),
+        withAlpha(0.25f, 0.25f, 0.25f)}},
+      {3,
+       {withAlpha(0, 0, 0), withAlpha(0.6f, 0.6f, 0.6f), withAlpha(0.3f, 0.3f, 0.3f),
+        withAlpha(0.5f, 0.5f, 0.5f)}},
+      // Cr (stored in blue) shows in red, Cb (stored in green) in blue.
+      {4,
+       {withAlpha(0, 0, 0), withAlpha(0.6f, 0, 0.4f), withAlpha(0.3f, 0, 0.1f),
+        withAlpha(0.5f, 0, 0.25f)}},
+      {5,
+       {withAlpha(0, 0, 0), withAlpha(0.39996f, 0.39996f, 0.39996f),
+        withAlpha(0.43329f, 0.43329f, 0.43329f), withAlpha(0.74995f, 0.74995f, 0.74995f)}},
+      {9,
+       {withAlpha(0, 0, 0), withAlpha(0.2f, 0.4f, 0.6f), withAlpha(0.9f, 0.1f, 0.3f),
+        withAlpha(1.5f, 0.25f, 0.5f)}},
+  };
+  for (const auto& [index, expected] : cases) {
+    const std::vector<Pixel> shown = display(kStored, static_cast<DisplayIndex>(index));
+    for (size_t i = 0; i < expected.size(); ++i) {
+      expectPixel(shown[i], expected[i],
+                  "index " + std::to_string(index) + " texel " + std::to_string(i));
+    }
+  }
+}
+
+TEST_F(WaveformDisplay, TintedTracesFadeToGreyAndSaturateToWhite) {
+  const std::vector<Pixel> stored = {{0, 0, 0, 0}, {0.3f, 0.3f, 0.3f, 1}, {1, 1, 1, 1}};
+  for (const auto index : {kDisplayRedTint, kDisplayGreenTint, kDisplayBlueTint}) {
+    const std::vector<Pixel> shown = display(stored, index);
+    const size_t own = static_cast<size_t>(index - kDisplayRedTint);
+    const std::string where = "index " + std::to_string(index);
+    expectPixel(shown[0], {0, 0, 0, 0}, where + " empty");
+    expectPixel(shown[2], {1, 1, 1, 1}, where + " saturated");
+    // A faint trace keeps its own hue: its channel is the brightest.
+    for (size_t c = 0; c < 3; ++c) {
+      if (c != own) {
+        EXPECT_GT(shown[1][own], shown[1][c] + 0.05f) << where << " channel " << c;
+      }
+    }
+    EXPECT_NEAR(shown[1][3], std::max(shown[1][0], std::max(shown[1][1], shown[1][2])), 1e-6)
+        << where;
+  }
+}
+
+}  // namespace
+}  // namespace waveform_test
