@@ -6,6 +6,7 @@
 #include "gl/glew_setup.h"
 #include "gl/plugin_exception.h"
 #include "plugin/scopes_effect_data.h"
+#include "scope/waveform_analysis.h"
 #include "scope/waveform_display.h"
 
 namespace plugin::Scopes {
@@ -22,6 +23,7 @@ void setUp(const Plugin::gl::HostCalls& host, ScopesEffectData& instance) {
     std::fflush(stdout);
   }
   instance.instancedDrawing = true;
+  ensureAnalysisPrograms(instance, verbose);
   ensureWaveformDisplayPrograms(instance, verbose);
   Plugin::gl::ensureCopyAndClearPrograms(instance, verbose);
 }

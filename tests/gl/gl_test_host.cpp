@@ -7,6 +7,29 @@ GlTestHost::GlTestHost() {
   record_.createBuffer = createBuffer;
   record_.releaseBuffer = releaseBuffer;
   record_.allocateTexture = allocateTexture;
+  record_.getInt = getInt;
+  record_.getFloat = getFloat;
+  record_.getAngle = getFloat;
+  record_.getPoint = getPoint;
+}
+
+std::array<float, 2> GlTestHost::value(vtpl::HostContext context, const char* id) {
+  const auto& parameters = of(context).parameters;
+  const auto found = parameters.find(id);
+  return found != parameters.end() ? found->second : std::array<float, 2>{};
+}
+
+int32_t GlTestHost::getInt(vtpl::HostContext context, const char* id, int32_t) {
+  return static_cast<int32_t>(value(context, id)[0]);
+}
+
+float GlTestHost::getFloat(vtpl::HostContext context, const char* id, int32_t) {
+  return value(context, id)[0];
+}
+
+void GlTestHost::getPoint(vtpl::HostContext context, const char* id, int32_t, float* x, float* y) {
+  *x = value(context, id)[0];
+  *y = value(context, id)[1];
 }
 
 GlTestHost::~GlTestHost() {

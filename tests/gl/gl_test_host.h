@@ -3,7 +3,10 @@
 #ifndef WAVEFORM_TESTS_GL_GL_TEST_HOST_H
 #define WAVEFORM_TESTS_GL_GL_TEST_HOST_H
 
+#include <array>
 #include <cstdint>
+#include <map>
+#include <string>
 #include <vector>
 
 #include "gl/gl_api.h"
@@ -29,6 +32,8 @@ class GlTestHost {
   uint32_t allocatedWidth = 0;
   uint32_t allocatedHeight = 0;
   std::vector<AllocationRequest> allocations;
+  // Parameter values by id for the get callbacks: a number, or a point's (x, y).
+  std::map<std::string, std::array<float, 2>> parameters;
   int buffersCreated = 0;
   int buffersReleased = 0;
 
@@ -38,6 +43,10 @@ class GlTestHost {
   static uint32_t createBuffer(vtpl::HostContext context, uint32_t target, uint32_t size,
                                const void* data, uint32_t usage, uint32_t* out, int32_t);
   static void releaseBuffer(vtpl::HostContext context, uint32_t name);
+  static std::array<float, 2> value(vtpl::HostContext context, const char* id);
+  static int32_t getInt(vtpl::HostContext context, const char* id, int32_t);
+  static float getFloat(vtpl::HostContext context, const char* id, int32_t);
+  static void getPoint(vtpl::HostContext context, const char* id, int32_t, float* x, float* y);
   static uint32_t allocateTexture(vtpl::HostContext context, const vtpl::HostRenderRecord*,
                                   uint32_t width, uint32_t height, uint32_t internalFormat,
                                   uint32_t format, uint32_t pixelType, uint32_t, uint32_t,

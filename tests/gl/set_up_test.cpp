@@ -6,6 +6,7 @@
 #include "plugin/instance_lifecycle.h"
 #include "plugin/notify.h"
 #include "plugin/scopes_effect_data.h"
+#include "scope/waveform_analysis.h"
 #include "scope/waveform_display.h"
 
 namespace waveform_test {
@@ -26,7 +27,9 @@ TEST_F(SetUp, BuildsTheProgramsOnceAndEnablesInstancedDrawing) {
   EXPECT_GE(instance.programId(kCopyWaveformProgram), 0);
   EXPECT_GE(instance.programId(kFillWaveformBackgroundProgram), 0);
   EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageSetUp), 1);
-  EXPECT_EQ(instance.programCount(), 4);
+  EXPECT_GE(instance.programId(kWaveformProgram), 0);
+  EXPECT_GE(instance.programId(kWaveformUIProgram), 0);
+  EXPECT_EQ(instance.programCount(), 6);
   EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroyInstance), 1);
 }
 

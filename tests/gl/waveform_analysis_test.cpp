@@ -1,0 +1,273 @@
+// The analysis pass on synthetic frames whose waveform is known without the shader's formulas.
+#include <gtest/gtest.h>
+
+#include <array>
+#include <cmath>
+#include <functional>
+#include <vector>
+
+#include "gl/framebuffer.h"
+#include "gl/host_textures.h"
+#include "gl_test_context.h"
+#include "gl_test_host.h"
+#include "scope/waveform_analysis.h"
+
+namespace waveform_test {
+namespace {
+
+using namespace plugin::Scopes;
+using Pixel = std::array<float, 4>;
+
+constexpr uint32_t kEightBit = GL_RGBA;
+constexpr uint32_t kFloat = GL_RGBA32F;
+
+struct Frame {
+  int width, height;
+  std::function<Pixel(int x, int y)> pixel;  // premultiplied, y from the bottom
+  uint32_t layerFormat = kEightBit;
+};
+
+struct Settings {
+  int32_t mode = 0;
+  int32_t colorSpace = 709;
+  float brightness = 1.0f;
+  float directionDegrees = 0.0f;
+  int32_t downsample = 0;
+  bool instanced = true;
+  bool fullFrame = true;
+  std::array<float, 2> clipStart{}, clipEnd{};
+};
+
+// A waveform read back: width x height RGBA floats, row 0 at the bottom.
+struct Waveform {
+  int width = 0, height = 0;
+  std::vector<float> values;
+  float at(int x, int row, int channel) const {
+    return values[4 * (static_cast<size_t>(row) * width + x) + channel];
+  }
+  // The rows of a column where the channel is lit.
+  std::vector<int> litRows(int x, int channel) const {
+    std::vector<int> rows;
+    for (int row = 0; row < height; ++row) {
+      if (at(x, row, channel) > 0.0f) {
+        rows.push_back(row);
+      }
+    }
+    return rows;
+  }
+};
+
+class WaveformAnalysis : public GlTest {};
+
+Waveform analyse(const Frame& frame, const Settings& settings) {
+  std::vector<Pixel> pixels;
+  for (int y = 0; y < frame.height; ++y) {
+    for (int x = 0; x < frame.width; ++x) {
+      pixels.push_back(frame.pixel(x, y));
+    }
+  }
+  vtpl::HostTexture layer{};
+  glGenTextures(1, &layer.name);
+  glBindTexture(GL_TEXTURE_2D, layer.name);
+  glTexImage2D(GL_TEXTURE_2D, 0, frame.layerFormat == kFloat ? GL_RGBA32F : GL_RGBA8, frame.width,
+               frame.height, 0, GL_RGBA, GL_FLOAT, pixels.data());
+  layer.format = frame.layerFormat;
+  layer.width = layer.allocatedWidth = static_cast<uint32_t>(frame.width);
+  layer.height = layer.allocatedHeight = static_cast<uint32_t>(frame.height);
+  layer.uMax = layer.vMax = 1.0f;
+
+  auto target = Plugin::gl::Texture::create();
+  const uint32_t rows = waveformTextureHeight(frame.layerFormat, layer.height);
+  target->define(layer.width, rows, GL_RGBA32F, 1.0f);
+
+  GlTestHost host;
+  host.parameters = {{"waveformMode", {float(settings.mode), 0}},
+                     {"colorSpace", {float(settings.colorSpace), 0}},
+                     {"waveformBrightness", {settings.brightness, 0}},
+                     {"waveformDirection", {settings.directionDegrees, 0}},
+                     {"analysisDownsample", {float(settings.downsample), 0}},
+                     {"clipStartPos", settings.clipStart},
+                     {"clipEndPos", settings.clipEnd}};
+  Plugin::gl::EffectData programs;
+  ensureAnalysisPrograms(programs, false);
+  Plugin::gl::StencilBufferList pool;
+  std::recursive_mutex lock;
+  const float w = static_cast<float>(frame.width), h = static_cast<float>(frame.height);
+  const Plugin::gl::Matrix4 projection = {2 / w, 0, 0,  0, 0,  2 / h, 0, 0,
+                                          0,     0, -1, 0, -1, -1,    0, 1};
+  const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+  AnalysisInput input;
+  input.layer = layer;
+  input.target = target;
+  input.fullFrame = settings.fullFrame;
+  input.frameWidth = frame.width;
+  input.frameHeight = frame.height;
+  input.projection = projection.data();
+  input.modelView = identity.data();
+
+  const Plugin::gl::FBO framebuffer;
+  glBindFramebuffer(GL_FRAMEBUFFER, framebuffer.name());
+  glClearColor(0, 0, 0, 0);
+  analyseLayer(host.calls(), {programs, pool, lock, settings.instanced}, input);
+
+  Waveform waveform;
+  waveform.width = frame.width;
+  waveform.height = static_cast<int>(rows);
+  waveform.values.resize(4 * static_cast<size_t>(frame.width) * rows);
+  glReadPixels(0, 0, frame.width, static_cast<GLsizei>(rows), GL_RGBA, GL_FLOAT,
+               waveform.values.data());
+  glBindFramebuffer(GL_FRAMEBUFFER, 0);
+  glDeleteTextures(1, &layer.name);
+  return waveform;
+}
+
+// The texture row a value lands in: values span the frame's height less one pixel, centred.
+double expectedRow(double value, int frameHeight, int rows, double low = 0, double high = 1) {
+  const double v = std::clamp((value - low) / (high - low), 0.0, 1.0);
+  const double y = (v - 0.5) * (frameHeight - 1) + frameHeight / 2.0;
+  return y / frameHeight * rows;
+}
+
+void expectOneRowNear(const Waveform& waveform, int x, int channel, double row,
+                      const std::string& what) {
+  const std::vector<int> lit = waveform.litRows(x, channel);
+  ASSERT_EQ(lit.size(), 1u) << what << " column " << x;
+  EXPECT_LE(std::fabs(lit[0] + 0.5 - row), 1.0) << what << " column " << x;
+}
+
+TEST_F(WaveformAnalysis, GreyFrameLightsOneRowPerColumn) {
+  const Frame grey{12, 16, [](int, int) { return Pixel{0.5f, 0.5f, 0.5f, 1}; }};
+  const Waveform waveform = analyse(grey, {});
+  ASSERT_EQ(waveform.height, 256);
+  for (int x = 0; x < grey.width; ++x) {
+    expectOneRowNear(waveform, x, 0, expectedRow(0.5, 16, 256), "grey");
+  }
+}
+
+TEST_F(WaveformAnalysis, HorizontalRampLightsTheRowOfEachColumnsValue) {
+  const Frame ramp{16, 8, [](int x, int) {
+                     const float v = x / 15.0f;
+                     return Pixel{v, v, v, 1};
+                   }};
+  const Waveform waveform = analyse(ramp, {});
+  for (int x = 0; x < ramp.width; ++x) {
+    expectOneRowNear(waveform, x, 1, expectedRow(x / 15.0, 8, 256), "ramp");
+  }
+}
+
+TEST_F(WaveformAnalysis, PureRedInRgbModePutsRedAtTheTopAndGreenAndBlueAtTheBottom) {
+  const Frame red{8, 8, [](int, int) { return Pixel{1, 0, 0, 1}; }};
+  Settings rgb;
+  rgb.mode = 1;
+  const Waveform waveform = analyse(red, rgb);
+  for (int x = 0; x < red.width; ++x) {
+    expectOneRowNear(waveform, x, 0, expectedRow(1, 8, 256), "red");
+    expectOneRowNear(waveform, x, 1, expectedRow(0, 8, 256), "green");
+    expectOneRowNear(waveform, x, 2, expectedRow(0, 8, 256), "blue");
+  }
+}
+
+TEST_F(WaveformAnalysis, GreyInCbCrPutsBothColourDifferencesAtTheMiddle) {
+  const Frame grey{8, 8, [](int, int) { return Pixel{0.25f, 0.25f, 0.25f, 1}; }};
+  Settings cbcr;
+  cbcr.mode = 4;
+  const Waveform waveform = analyse(grey, cbcr);
+  for (int x = 0; x < grey.width; ++x) {
+    expectOneRowNear(waveform, x, 0, expectedRow(0.25, 8, 256), "luma");
+    expectOneRowNear(waveform, x, 1, expectedRow(0.5, 8, 256), "Cb");
+    expectOneRowNear(waveform, x, 2, expectedRow(0.5, 8, 256), "Cr");
+  }
+}
+
+TEST_F(WaveformAnalysis, TransparentFrameLeavesTheTextureCleared) {
+  const Frame clear{8, 8, [](int, int) { return Pixel{0, 0, 0, 0}; }};
+  for (const int32_t mode : {0, 1, 4, 8}) {
+    Settings settings;
+    settings.mode = mode;
+    const Waveform waveform = analyse(clear, settings);
+    for (const float value : waveform.values) {
+      ASSERT_EQ(value, 0.0f) << "mode " << mode;
+    }
+  }
+}
+
+TEST_F(WaveformAnalysis, LumaOfRedFollowsTheColourSpace) {
+  const Frame red{4, 16, [](int, int) { return Pixel{1, 0, 0, 1}; }, kFloat};
+  for (const auto& [space, luma] :
+       std::vector<std::pair<int32_t, double>>{{601, 0.299}, {709, 0.2126}, {2020, 0.2627}}) {
+    Settings settings;
+    settings.colorSpace = space;
+    const Waveform waveform = analyse(red, settings);
+    ASSERT_EQ(waveform.height, 256);
+    for (int x = 0; x < red.width; ++x) {
+      expectOneRowNear(waveform, x, 0, expectedRow(luma, 16, 256, -0.25, 1.25),
+                       "space " + std::to_string(space));
+    }
+  }
+}
+
+TEST_F(WaveformAnalysis, FloatLayerSpansMinusAQuarterToOneAndAQuarter) {
+  const Frame extremes{2, 300,
+                       [](int x, int) {
+                         const float v = x == 0 ? -0.25f : 1.25f;
+                         return Pixel{v, v, v, 1};
+                       },
+                       kFloat};
+  const Waveform waveform = analyse(extremes, {});
+  ASSERT_EQ(waveform.height, 300);
+  EXPECT_EQ(waveform.litRows(0, 0), std::vector<int>{0});
+  EXPECT_EQ(waveform.litRows(1, 0), std::vector<int>{299});
+  EXPECT_EQ(waveformTextureHeight(GL_RGBA, 1080), 256u);
+  EXPECT_EQ(waveformTextureHeight(GL_RGBA32F, 1080), 1080u);
+  EXPECT_EQ(waveformTextureHeight(GL_RGBA32F, 100), 256u);
+}
+
+TEST_F(WaveformAnalysis, StencilCapsHowBrightAColumnOfIdenticalPixelsGets) {
+  EXPECT_EQ(saturationCap(pointIntensity(1.0f, 1080, false, 1080)), 15);
+  EXPECT_EQ(saturationCap(pointIntensity(0.1f, 1080, false, 1080)), 100);
+  // 64 identical pixels per column at a low brightness: intensity 0.1 x 256 / 64 x 0.25 = 0.1,
+  // so n = 10 and Luminance accepts 3n + 1 = 31 points per output pixel.
+  const Frame flat{4, 64, [](int, int) { return Pixel{0.5f, 0.5f, 0.5f, 1}; }};
+  Settings dim;
+  dim.brightness = 0.25f;
+  const Waveform waveform = analyse(flat, dim);
+  const std::vector<int> lit = waveform.litRows(0, 0);
+  ASSERT_EQ(lit.size(), 1u);
+  EXPECT_NEAR(waveform.at(0, lit[0], 0), 31 * 0.1f, 1e-4);
+  EXPECT_EQ(waveform.at(0, lit[0], 3), 1.0f);  // alpha keeps its largest value
+}
+
+TEST_F(WaveformAnalysis, InstancedAndPerColumnDrawingAgree) {
+  const Frame busy{
+      24, 12, [](int x, int y) {
+        return Pixel{(x * 7 % 11) / 10.0f, (y * 3 % 7) / 6.0f, ((x + y) % 5) / 4.0f, 1};
+      }};
+  for (const int32_t mode : {0, 1, 4}) {
+    Settings instanced;
+    instanced.mode = mode;
+    Settings perColumn = instanced;
+    perColumn.instanced = false;
+    EXPECT_EQ(analyse(busy, instanced).values, analyse(busy, perColumn).values) << mode;
+  }
+}
+
+TEST_F(WaveformAnalysis, ClipPointsInEitherOrderGiveTheSameWaveform) {
+  const Frame busy{32, 16, [](int x, int y) {
+                     const float v = ((x * 5 + y * 3) % 17) / 16.0f;
+                     return Pixel{v, v, v, 1};
+                   }};
+  Settings forward;
+  forward.fullFrame = false;
+  forward.clipStart = {-10, -4};
+  forward.clipEnd = {6, 5};
+  Settings backward = forward;
+  std::swap(backward.clipStart, backward.clipEnd);
+  const Waveform a = analyse(busy, forward);
+  EXPECT_EQ(a.values, analyse(busy, backward).values);
+  // Columns outside the clip stay dark.
+  EXPECT_TRUE(a.litRows(0, 0).empty());
+  EXPECT_FALSE(a.litRows(10, 0).empty());
+}
+
+}  // namespace
+}  // namespace waveform_test
