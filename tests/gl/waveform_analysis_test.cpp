@@ -1,6 +1,7 @@
 // The analysis pass on synthetic frames whose waveform is known without the shader's formulas.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <functional>
@@ -35,6 +36,7 @@ struct Settings {
   int32_t downsample = 0;
   bool instanced = true;
   bool fullFrame = true;
+  bool linearInput = false;
   std::array<float, 2> clipStart{}, clipEnd{};
 };
 
@@ -100,6 +102,7 @@ Waveform analyse(const Frame& frame, const Settings& settings) {
   input.layer = layer;
   input.target = target;
   input.fullFrame = settings.fullFrame;
+  input.linearInput = settings.linearInput;
   input.frameWidth = frame.width;
   input.frameHeight = frame.height;
   input.projection = projection.data();
@@ -267,6 +270,69 @@ TEST_F(WaveformAnalysis, ClipPointsInEitherOrderGiveTheSameWaveform) {
   // Columns outside the clip stay dark.
   EXPECT_TRUE(a.litRows(0, 0).empty());
   EXPECT_FALSE(a.litRows(10, 0).empty());
+}
+
+TEST_F(WaveformAnalysis, DirectionNinetyDegreesTurnsLayerRowsIntoStretchedScopeColumns) {
+  // Each layer row has its own value; turned by 90 degrees the rows run along the scope, and the
+  // 8 rows are stretched over the 16-pixel width: row y lands on the edge between scope columns
+  // 14 - 2y and 15 - 2y, and lights exactly one of them.
+  const Frame rows{16, 8, [](int, int y) {
+                     const float v = y / 7.0f;
+                     return Pixel{v, v, v, 1};
+                   }};
+  Settings turned;
+  turned.directionDegrees = 90.0f;
+  const Waveform waveform = analyse(rows, turned);
+  for (int y = 0; y < rows.height; ++y) {
+    const int left = 14 - 2 * y;
+    const bool leftLit = !waveform.litRows(left, 0).empty();
+    const bool rightLit = !waveform.litRows(left + 1, 0).empty();
+    ASSERT_NE(leftLit, rightLit) << "layer row " << y;
+    expectOneRowNear(waveform, leftLit ? left : left + 1, 0, expectedRow(y / 7.0, 8, 256),
+                     "turned");
+  }
+}
+
+TEST_F(WaveformAnalysis, HalfDownsamplingSamplesEverySecondPixelWithLargerPoints) {
+  const Frame columns{16, 8, [](int x, int) {
+                        const float v = x / 15.0f;
+                        return Pixel{v, v, v, 1};
+                      }};
+  Settings full;
+  Settings half;
+  half.downsample = 1;
+  const Waveform fine = analyse(columns, full);
+  const Waveform coarse = analyse(columns, half);
+  for (int pair = 0; pair < 8; ++pair) {
+    const std::vector<int> left = coarse.litRows(2 * pair, 0);
+    // A 2-pixel point covers two rows of both columns of the pair.
+    EXPECT_EQ(left.size(), 2u) << "pair " << pair;
+    EXPECT_EQ(left, coarse.litRows(2 * pair + 1, 0)) << "pair " << pair;
+    // It shows one of the pair's two values.
+    const std::vector<int> even = fine.litRows(2 * pair, 0);
+    const std::vector<int> odd = fine.litRows(2 * pair + 1, 0);
+    ASSERT_FALSE(left.empty());
+    const bool showsEven = std::find(left.begin(), left.end(), even[0]) != left.end();
+    const bool showsOdd = std::find(left.begin(), left.end(), odd[0]) != left.end();
+    EXPECT_TRUE(showsEven || showsOdd) << "pair " << pair;
+  }
+}
+
+TEST_F(WaveformAnalysis, LinearInputIsEncodedToSrgbBeforeMeasuring) {
+  // 0.214041 in linear light is 0.5 after the sRGB curve.
+  const Frame linearGrey{4, 8,
+                         [](int, int) {
+                           return Pixel{0.214041f, 0.214041f, 0.214041f, 1};
+                         },
+                         kFloat};
+  Settings linear;
+  linear.linearInput = true;
+  const Waveform encoded = analyse(linearGrey, linear);
+  const Waveform raw = analyse(linearGrey, {});
+  for (int x = 0; x < 4; ++x) {
+    expectOneRowNear(encoded, x, 0, expectedRow(0.5, 8, 256, -0.25, 1.25), "encoded");
+    expectOneRowNear(raw, x, 0, expectedRow(0.214041, 8, 256, -0.25, 1.25), "raw");
+  }
 }
 
 }  // namespace
