@@ -14,8 +14,10 @@ namespace vtpl::host {
 namespace {
 
 constexpr char kParentLayerName[] = "Effect_Parent_Layer";
-// The identifier of the frames this host renders; not the all-zero form.
+// The identifier of the frames this host renders, and the all-zero form of a render without one.
 constexpr char kRenderIdentifier[] = "5c0e1f2a-3b4c-4d5e-8f60-718293a4b5c6";
+constexpr char kNoIdentifier[] = "00000000-0000-0000-0000-000000000000";
+constexpr char kControlId[] = "waveformControl";
 
 std::array<float, 16> orthographic(float width, float height) {
   return {2.0f / width, 0, 0, 0, 0, 2.0f / height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
@@ -136,7 +138,7 @@ void EffectHost::setValueFromText(const std::string& id, const std::string& text
   expectHandled(kMessageParameterEdited, editParameter(id), "take the edit of '" + id + "'");
 }
 
-Image EffectHost::renderFrame(const Image& layer, bool asFloat) {
+Image EffectHost::renderFrame(const Image& layer, bool asFloat, const FrameOptions& options) {
   if (renderThread_ == nullptr) {
     throw HostError("rendering needs a host with GL");
   }
@@ -154,7 +156,9 @@ Image EffectHost::renderFrame(const Image& layer, bool asFloat) {
       orthographic(static_cast<float>(layer.width), static_cast<float>(layer.height));
   const std::array<float, 16> identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
   HostRenderRecord frame{};
-  frame.identifier = kRenderIdentifier;
+  frame.identifier = options.noIdentifier ? kNoIdentifier : kRenderIdentifier;
+  frame.frameIndex = options.frameIndex;
+  frame.unwatched = options.unwatched ? 1 : 0;
   frame.source = &source;
   frame.destination = &destination;
   frame.textureScale = 1.0f;
@@ -179,6 +183,22 @@ Image EffectHost::renderFrame(const Image& layer, bool asFloat) {
   });
   expectHandled(kMessageRender, result, "render the frame");
   return output;
+}
+
+int32_t EffectHost::drawControl(const ControlOptions& options) {
+  HostControlRecord control{};
+  control.identifier = options.noIdentifier ? kNoIdentifier : kRenderIdentifier;
+  control.controlId = kControlId;
+  control.width = options.width;
+  control.height = options.height;
+  control.labelScaleX = control.labelScaleY = 1.0;
+  control.frameIndex = options.frameIndex;
+  control.frameCount = options.frameCount;
+  control.force = options.force ? 1 : 0;
+  record_.messageRecord = &control;
+  const int32_t result = send(kMessageDrawControl);
+  record_.messageRecord = nullptr;
+  return result;
 }
 
 HostTexture EffectHost::allocateWorkingTexture(uint32_t width, uint32_t height, bool asFloat) {
@@ -212,8 +232,14 @@ void EffectHost::expectHandled(int32_t message, int32_t result, const std::strin
   }
 }
 
+int EffectHost::callbackCount(const std::string& name) const {
+  const auto found = callbacksByName_.find(name);
+  return found != callbacksByName_.end() ? found->second : 0;
+}
+
 void EffectHost::enterCallback(std::string_view name) {
   ++callbackCount_;
+  ++callbacksByName_[std::string(name)];
   if (name != faults_.throwInCallback) {
     return;
   }

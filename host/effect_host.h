@@ -4,6 +4,7 @@
 #define VTPL_HOST_EFFECT_HOST_H
 
 #include <cstdint>
+#include <map>
 #include <memory>
 #include <ostream>
 #include <string>
@@ -43,6 +44,23 @@ struct HostFaults {
   int stopAtProgress = -1;        // progress asks to stop from this many steps done on
 };
 
+// How a frame is rendered: the editor's marks on the render record.
+struct FrameOptions {
+  bool unwatched = false;     // no scope control shows this frame
+  bool noIdentifier = false;  // the all-zero identifier: analyse the whole frame
+  int32_t frameIndex = 0;
+};
+
+// What the editor asks of a scope control drawing.
+struct ControlOptions {
+  int32_t frameIndex = 0;
+  int32_t frameCount = 1;
+  bool force = false;
+  bool noIdentifier = false;
+  int32_t width = 250;
+  int32_t height = 150;
+};
+
 // A layer the host can report to the effect (message 7 with "Effect_Parent_Layer").
 struct HostLayer {
   HostLayerInfo info{};
@@ -74,7 +92,12 @@ class EffectHost {
   void setValueFromText(const std::string& id, const std::string& text);
   // Message 10 for one frame of `layer` (8-bit storage, or float storage when asked or when the
   // picture has 16 bits); returns the output, read back. Needs GL. Throws HostError.
-  Image renderFrame(const Image& layer, bool asFloat = false);
+  Image renderFrame(const Image& layer, bool asFloat = false, const FrameOptions& options = {});
+  // Messages 1001 and 1002, as the editor sends them while a scope panel is open.
+  int32_t attachControl() { return send(kMessageAttach); }
+  int32_t detachControl() { return send(kMessageDetach); }
+  // Message 1003 for the scope control, on the interface thread.
+  int32_t drawControl(const ControlOptions& options);
 
   HostEffectRecord& record() { return record_; }
   ParameterStore& parameters() { return store_; }
@@ -86,6 +109,8 @@ class EffectHost {
   const std::vector<std::string>& unknownParameterIds() const { return unknownIds_; }
   int redrawRequests() const { return redrawRequests_; }
   int callbackCount() const { return callbackCount_; }
+  // How often the effect called the callback of this name.
+  int callbackCount(const std::string& name) const;
 
   // Bookkeeping for the callback table.
   void enterCallback(std::string_view name);  // counts; commits an injected throw
@@ -119,6 +144,7 @@ class EffectHost {
   int declarationsSeen_ = 0;
   int redrawRequests_ = 0;
   int callbackCount_ = 0;
+  std::map<std::string, int, std::less<>> callbacksByName_;
   std::vector<HostTexture> workingTextures_;
   Image ownLayer_;  // the picture of the frame last rendered (frame index 0)
   bool ownLayerIsFloat_ = false;

@@ -1,6 +1,7 @@
 #include "plugin/notify.h"
 
 #include "gl/host_calls.h"
+#include "plugin/draw_control.h"
 #include "plugin/instance_lifecycle.h"
 #include "plugin/parameter_declarations.h"
 #include "plugin/parameter_reactions.h"
@@ -61,8 +62,10 @@ int32_t handleMessage(HostContext context, HostEffectRecord& record, int32_t mes
       detachControl(record);
       return kResultHandled;
     case kMessageDrawControl:
-      // Nothing is drawn yet: the control is left as the host gave it.
-      return kResultHandled;
+      if (instanceOf(record) == nullptr) {
+        return kResultNotHandled;
+      }
+      return drawControl(host, *instanceOf(record));
     default:
       if (message >= kMessageAcknowledgedFirst && message <= kMessageAcknowledgedLast) {
         return kResultHandled;

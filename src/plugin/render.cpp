@@ -1,26 +1,126 @@
 #include "plugin/render.h"
 
+#include <array>
+
 #include "gl/copy_pass.h"
 #include "gl/host_textures.h"
+#include "plugin/instance_lifecycle.h"
 #include "plugin/scopes_effect_data.h"
+#include "plugin/waveform_results.h"
+#include "scope/parameter_choices.h"
+#include "scope/parameter_ids.h"
+#include "scope/waveform_analysis.h"
 
 namespace plugin::Scopes {
 namespace {
 
+using Plugin::gl::HostCalls;
+using vtpl::HostEffectRecord;
+
 constexpr int32_t kProgressTotal = 100;
+constexpr char kControlId[] = "waveformControl";
+
+// Asks the host how far the render is; once it asks to stop, the render stays stopped.
+class Progress {
+ public:
+  explicit Progress(const HostCalls& host) : host_(host) {}
+  bool report(int32_t done) {
+    stopped_ = host_.call(&HostEffectRecord::progress, done, kProgressTotal) != 0 || stopped_;
+    return stopped_;
+  }
+  bool stopped() const { return stopped_; }
+
+ private:
+  const HostCalls& host_;
+  bool stopped_ = false;
+};
+
+// The effect's own layer, analysed into a new waveform texture modelled on the output.
+std::shared_ptr<Plugin::gl::Texture> analyseOwnLayer(const HostCalls& host,
+                                                     ScopesEffectData& instance,
+                                                     const vtpl::HostRenderRecord& frame,
+                                                     bool fullFrame) {
+  const vtpl::HostTexture& output = *frame.destination;
+  auto target =
+      acquireTexture(instance, output.width, waveformTextureHeight(output.format, output.height),
+                     output.format, frame.textureScale);
+  AnalysisInput input;
+  input.layer = *frame.source;
+  input.target = target;
+  input.fullFrame = fullFrame;
+  input.time = frame.time;
+  input.frameWidth = frame.frameWidth;
+  input.frameHeight = frame.frameHeight;
+  input.layerScale[0] = frame.frameWidth > 0 ? float(frame.source->width) / frame.frameWidth : 1;
+  input.layerScale[1] = frame.frameHeight > 0 ? float(frame.source->height) / frame.frameHeight : 1;
+  input.renderScaleX = frame.renderScaleX;
+  input.renderScaleY = frame.renderScaleY;
+  input.projection = frame.projection;
+  input.modelView = frame.modelView;
+  input.linearInput = frame.linearLight != 0;
+  analyseLayer(host,
+               {instance, instance.stencilPool, instance.resourceLock, instance.instancedDrawing},
+               input);
+  return target;
+}
+
+// Steps 3 to 6 of a frame: decide, analyse, publish.
+void analyseAndPublish(const HostCalls& host, ScopesEffectData& instance, ScopesSharedData& shared,
+                       const vtpl::HostRenderRecord& frame, bool noIdentifier, Progress& progress) {
+  const int32_t blend = host.call(&HostEffectRecord::getInt, ParamId::kBlendType, frame.time);
+  const bool blending = blend != kBlendNone;
+  const bool analyse = frame.unwatched != 0
+                           ? blending
+                           : shared.attachmentCount.load() > 0 || noIdentifier || blending;
+  if (!analyse || progress.stopped()) {
+    if (frame.unwatched == 0 && shared.attachmentCount.load() <= 0 && !noIdentifier) {
+      shared.resultsFresh.exchange(0);
+    }
+    return;
+  }
+  // The comparison layer is fetched once composition with a second layer is in place; until
+  // then it counts as absent.
+  const bool showComparison =
+      host.call(&HostEffectRecord::getBool, ParamId::kShowComparison, frame.time) != 0;
+  const int32_t type = host.call(&HostEffectRecord::getInt, ParamId::kScopeComparisonType, 0);
+  const LayerChoice layers = chooseLayers(false, type, showComparison);
+
+  if (!progress.report(10)) {
+    shared.analysedFrame = frame.frameIndex;
+  }
+  storeResult(shared, &ScopesSharedData::comparison, nullptr, 1, 1);
+  progress.report(50);
+  if (layers.own && !progress.stopped()) {
+    auto waveform = analyseOwnLayer(host, instance, frame, noIdentifier);
+    if (!progress.report(80)) {
+      storeResult(shared, &ScopesSharedData::primary, std::move(waveform), frame.frameWidth,
+                  frame.frameHeight);
+    }
+  } else if (!layers.own) {
+    storeResult(shared, &ScopesSharedData::primary, nullptr, 1, 1);
+  }
+  if (frame.unwatched == 0 && !progress.stopped()) {
+    shared.resultsFresh.exchange(1);
+    host.call(&HostEffectRecord::redrawControl, kControlId);
+  }
+}
 
 }  // namespace
 
-int32_t render(const Plugin::gl::HostCalls& host, ScopesEffectData& instance) {
+int32_t render(const HostCalls& host, ScopesEffectData& instance) {
   const auto* frame = static_cast<const vtpl::HostRenderRecord*>(host.record().messageRecord);
   if (frame == nullptr || frame->source == nullptr || frame->destination == nullptr) {
     return vtpl::kResultNotHandled;
   }
-  // A stop asked for here ends the analysis; the layer is still copied to the output.
-  host.call(&vtpl::HostEffectRecord::progress, 0, kProgressTotal);
+  const bool noIdentifier = isNoIdentifier(frame->identifier);
+  Progress progress(host);
+  progress.report(0);
+  if (ScopesSharedData* shared = sharedDataOf(host.record())) {
+    analyseAndPublish(host, instance, *shared, *frame, noIdentifier, progress);
+  }
 
   Plugin::gl::copyPass(host, instance, *frame->source, *frame->destination);
-  host.call(&vtpl::HostEffectRecord::progress, 90, kProgressTotal);
+  progress.report(90);
 
   // The host expects its output attached, nothing bound on unit 0 and no program in use.
   Plugin::gl::attachTexture(*frame->destination, 0, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D);

@@ -1,0 +1,98 @@
+#include "plugin/draw_control.h"
+
+#include <cstring>
+
+#include "gl/host_textures.h"
+#include "plugin/instance_lifecycle.h"
+#include "plugin/scopes_effect_data.h"
+#include "plugin/waveform_results.h"
+#include "scope/parameter_ids.h"
+#include "scope/waveform_analysis.h"
+
+namespace plugin::Scopes {
+namespace {
+
+using Plugin::gl::HostCalls;
+using vtpl::HostEffectRecord;
+
+constexpr char kControlId[] = "waveformControl";
+
+Plugin::gl::Matrix4 orthographic(float width, float height) {
+  return {2.0f / width, 0, 0, 0, 0, 2.0f / height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
+}
+
+// The own layer of the control's frame, fetched from the host and analysed with "WaveformUI".
+void analyseOnInterfaceThread(const HostCalls& host, ScopesEffectData& instance,
+                              ScopesSharedData& shared, const vtpl::HostControlRecord& control) {
+  const bool showComparison =
+      host.call(&HostEffectRecord::getBool, ParamId::kShowComparison, control.time) != 0;
+  const int32_t type = host.call(&HostEffectRecord::getInt, ParamId::kScopeComparisonType, 0);
+  const LayerChoice layers = chooseLayers(false, type, showComparison);
+  shared.analysedFrame = control.frameIndex;
+  storeResult(shared, &ScopesSharedData::comparison, nullptr, 1, 1);
+  if (!layers.own) {
+    storeResult(shared, &ScopesSharedData::primary, nullptr, 1, 1);
+    return;
+  }
+  vtpl::HostTexture own{};
+  host.call(&HostEffectRecord::fetchOwnLayer, 0, control.frameIndex, &own);
+  if (own.name == 0) {
+    return;
+  }
+  const float width = static_cast<float>(own.width);
+  const float height = static_cast<float>(own.height);
+  const Plugin::gl::Matrix4 projection = orthographic(width, height);
+  const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+  AnalysisInput input;
+  input.layer = own;
+  input.target = acquireTexture(instance, own.width, waveformTextureHeight(own.format, own.height),
+                                own.format, 1.0f);
+  input.time = control.time;
+  input.frameWidth = static_cast<int32_t>(own.width);
+  input.frameHeight = static_cast<int32_t>(own.height);
+  input.projection = projection.data();
+  input.modelView = identity.data();
+  input.interfaceProgram = true;
+  analyseLayer(host,
+               {instance, instance.stencilPool, instance.resourceLock, instance.instancedDrawing},
+               input);
+  storeResult(shared, &ScopesSharedData::primary, input.target, input.frameWidth,
+              input.frameHeight);
+  host.call(&HostEffectRecord::releaseLayer, nullptr, own.name);
+}
+
+}  // namespace
+
+int32_t drawControl(const HostCalls& host, ScopesEffectData& instance) {
+  const auto* control = static_cast<const vtpl::HostControlRecord*>(host.record().messageRecord);
+  if (control == nullptr || control->controlId == nullptr ||
+      std::strcmp(control->controlId, kControlId) != 0) {
+    return vtpl::kResultHandled;
+  }
+  ScopesSharedData* shared = sharedDataOf(host.record());
+  if (shared != nullptr && !isNoIdentifier(control->identifier) &&
+      (control->force != 0 || shared->resultsFresh.load() == 0) && control->frameIndex >= 0 &&
+      control->frameIndex < control->frameCount && control->frameIndex != shared->analysedFrame) {
+    // The host's own drawing target is put back after the analysis.
+    GLint attached = 0;
+    GLint viewport[4] = {};
+    glGetFramebufferAttachmentParameteriv(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0,
+                                          GL_FRAMEBUFFER_ATTACHMENT_OBJECT_NAME, &attached);
+    glGetIntegerv(GL_VIEWPORT, viewport);
+    analyseOnInterfaceThread(host, instance, *shared, *control);
+    shared->resultsFresh.exchange(1);
+    if (attached != 0) {
+      glFramebufferTexture2D(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D,
+                             static_cast<GLuint>(attached), 0);
+      glViewport(viewport[0], viewport[1], viewport[2], viewport[3]);
+    }
+  }
+  // The scope itself is drawn here once the composition is in place.
+  instance.releaseProgram();
+  Plugin::gl::unbindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, false);
+  glFlush();
+  glFinish();
+  return vtpl::kResultHandled;
+}
+
+}  // namespace plugin::Scopes

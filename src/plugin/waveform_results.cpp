@@ -1,0 +1,41 @@
+#include "plugin/waveform_results.h"
+
+#include <cstring>
+
+#include "plugin/scopes_effect_data.h"
+#include "scope/parameter_choices.h"
+#include "vtpl/host_interface.h"
+
+namespace plugin::Scopes {
+
+bool isNoIdentifier(const char* identifier) {
+  static constexpr char kNoIdentifier[] = "00000000-0000-0000-0000-000000000000";
+  return identifier == nullptr ||
+         std::memcmp(identifier, kNoIdentifier, vtpl::kIdentifierChars) == 0;
+}
+
+LayerChoice chooseLayers(bool comparisonPresent, int32_t comparisonType, bool showComparison) {
+  const bool singleScope = comparisonType == kComparisonSingleScope;
+  return {comparisonPresent && (!singleScope || showComparison),
+          !(comparisonPresent && singleScope && showComparison)};
+}
+
+std::shared_ptr<Plugin::gl::Texture> acquireTexture(ScopesEffectData& instance, uint32_t width,
+                                                    uint32_t height, uint32_t internalFormat,
+                                                    float scale) {
+  const std::lock_guard<std::recursive_mutex> guard(instance.resourceLock);
+  auto texture = Plugin::gl::Texture::create();
+  texture->define(width, height, internalFormat, scale);
+  return texture;
+}
+
+void storeResult(ScopesSharedData& shared, WaveformResult ScopesSharedData::*slot,
+                 std::shared_ptr<Plugin::gl::Texture> texture, int32_t width, int32_t height) {
+  const std::lock_guard<std::mutex> guard(shared.lock);
+  if (texture != nullptr) {
+    texture->placeFence();
+  }
+  shared.*slot = WaveformResult{std::move(texture), width, height};
+}
+
+}  // namespace plugin::Scopes

@@ -1,0 +1,39 @@
+// The waveforms one effect publishes: which layers to analyse, the textures that hold the
+// results, and storing them in the shared data for the other thread.
+#ifndef WAVEFORM_PLUGIN_WAVEFORM_RESULTS_H
+#define WAVEFORM_PLUGIN_WAVEFORM_RESULTS_H
+
+#include <cstdint>
+#include <memory>
+
+#include "gl/texture.h"
+#include "plugin/scopes_shared_data.h"
+
+namespace plugin::Scopes {
+
+class ScopesEffectData;
+
+// True for a null identifier or the all-zero form: a render without identifier, which analyses
+// the whole frame.
+bool isNoIdentifier(const char* identifier);
+
+struct LayerChoice {
+  bool comparison;
+  bool own;
+};
+// Single Scope with "Comparison Layer" on shows only the comparison; otherwise both are shown
+// when present.
+LayerChoice chooseLayers(bool comparisonPresent, int32_t comparisonType, bool showComparison);
+
+// A new texture with storage of this size and format, created under the resource lock.
+std::shared_ptr<Plugin::gl::Texture> acquireTexture(ScopesEffectData& instance, uint32_t width,
+                                                    uint32_t height, uint32_t internalFormat,
+                                                    float scale);
+
+// Publishes a result: fenced first, so that a reader on the other context waits for it.
+void storeResult(ScopesSharedData& shared, WaveformResult ScopesSharedData::*slot,
+                 std::shared_ptr<Plugin::gl::Texture> texture, int32_t width, int32_t height);
+
+}  // namespace plugin::Scopes
+
+#endif  // WAVEFORM_PLUGIN_WAVEFORM_RESULTS_H

@@ -1,0 +1,127 @@
+// When a render analyses, marks the published results stale and asks for a redraw, and when
+// the scope control analyses a frame itself, seen through the host's callbacks.
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "waveform_module.h"
+
+namespace waveform_test {
+namespace {
+
+using vtpl::host::ControlOptions;
+using vtpl::host::EffectHost;
+using vtpl::host::FrameOptions;
+using vtpl::host::Image;
+
+Image greyPicture() {
+  Image picture;
+  picture.width = 16;
+  picture.height = 8;
+  picture.rgba.assign(4 * 16 * 8, 0.5f);
+  for (size_t i = 3; i < picture.rgba.size(); i += 4) {
+    picture.rgba[i] = 1.0f;
+  }
+  return picture;
+}
+
+std::unique_ptr<EffectHost> openGlHost() {
+  vtpl::host::HostSettings settings = declaredStateSettings();
+  settings.gl = true;
+  return openHost(settings);
+}
+
+// Only the analysis reads the direction, so its reads count analyses.
+int analyses(const EffectHost& host) {
+  return host.callbackCount("getAngle");
+}
+int ownLayerFetches(const EffectHost& host) {
+  return host.callbackCount("fetchOwnLayer");
+}
+
+TEST(RenderFlow, DecisionTable) {
+  struct Case {
+    bool unwatched;
+    int attachments;
+    bool noIdentifier;
+    int32_t blend;
+    bool analysed;
+    bool redrawAsked;
+    bool markedStale;
+  };
+  const Case cases[] = {
+      {false, 0, false, 0, false, false, true}, {false, 1, false, 0, true, true, false},
+      {false, 0, true, 0, true, true, false},   {false, 0, false, 1, true, true, false},
+      {false, 2, true, 9, true, true, false},   {true, 1, false, 0, false, false, false},
+      {true, 0, false, 1, true, false, false},  {true, 0, true, 0, false, false, false},
+  };
+  for (const Case& c : cases) {
+    const std::string what = "unwatched " + std::to_string(c.unwatched) + ", attached " +
+                             std::to_string(c.attachments) + ", no identifier " +
+                             std::to_string(c.noIdentifier) + ", blend " + std::to_string(c.blend);
+    auto host = openGlHost();
+    ASSERT_TRUE(host->parameters().writeInt("blendType", c.blend)) << what;
+    for (int i = 0; i < c.attachments; ++i) {
+      host->attachControl();
+    }
+    FrameOptions frame;
+    frame.unwatched = c.unwatched;
+    frame.noIdentifier = c.noIdentifier;
+    host->renderFrame(greyPicture(), false, frame);
+    EXPECT_EQ(analyses(*host) > 0, c.analysed) << what;
+    EXPECT_EQ(host->redrawRequests() > 0, c.redrawAsked) << what;
+    // Stale results make the next control drawing of the frame analyse it itself.
+    ASSERT_EQ(host->drawControl({}), 1) << what;
+    EXPECT_EQ(ownLayerFetches(*host) > 0, c.markedStale) << what;
+  }
+}
+
+TEST(RenderFlow, StopAtTenLeavesTheAnalysedFrameUnchanged) {
+  for (const bool stop : {false, true}) {
+    auto host = openGlHost();
+    host->attachControl();
+    host->faults().stopAtProgress = stop ? 10 : -1;
+    FrameOptions frame;
+    frame.frameIndex = 3;
+    host->renderFrame(greyPicture(), false, frame);
+    EXPECT_EQ(host->redrawRequests(), stop ? 0 : 1);
+    // A forced drawing of frame 3 analyses only if the render did not record frame 3.
+    ControlOptions control;
+    control.frameIndex = 3;
+    control.frameCount = 5;
+    control.force = true;
+    host->drawControl(control);
+    EXPECT_EQ(ownLayerFetches(*host), stop ? 1 : 0) << "stop " << stop;
+  }
+}
+
+TEST(RenderFlow, ControlAnalysesAStaleFrameOnlyOnce) {
+  auto host = openGlHost();
+  host->renderFrame(greyPicture());  // nothing attached: results marked stale
+  ASSERT_EQ(analyses(*host), 0);
+  host->drawControl({});
+  EXPECT_EQ(ownLayerFetches(*host), 1);
+  EXPECT_EQ(analyses(*host), 1);
+  host->drawControl({});
+  ControlOptions forced;
+  forced.force = true;
+  host->drawControl(forced);
+  EXPECT_EQ(ownLayerFetches(*host), 1);  // frame 0 is already analysed
+  // Frames outside the clip's frame count and drawings without identifier never analyse.
+  ControlOptions outside;
+  outside.frameIndex = 4;
+  outside.frameCount = 4;
+  outside.force = true;
+  host->drawControl(outside);
+  ControlOptions anonymous;
+  anonymous.frameIndex = 2;
+  anonymous.frameCount = 4;
+  anonymous.force = true;
+  anonymous.noIdentifier = true;
+  host->drawControl(anonymous);
+  EXPECT_EQ(ownLayerFetches(*host), 1);
+  EXPECT_EQ(host->callbackCount("releaseLayer"), 1);
+}
+
+}  // namespace
+}  // namespace waveform_test
