@@ -95,6 +95,19 @@ TEST(RenderFlow, StopAtTenLeavesTheAnalysedFrameUnchanged) {
   }
 }
 
+TEST(RenderFlow, StoppedRenderWithoutIdentifierKeepsTheResults) {
+  for (const bool noIdentifier : {false, true}) {
+    auto host = openGlHost();
+    host->faults().stopAtProgress = 0;
+    FrameOptions frame;
+    frame.noIdentifier = noIdentifier;
+    host->renderFrame(greyPicture(), false, frame);
+    EXPECT_EQ(analyses(*host), 0);
+    host->drawControl({});
+    EXPECT_EQ(ownLayerFetches(*host), noIdentifier ? 0 : 1) << "no identifier " << noIdentifier;
+  }
+}
+
 TEST(RenderFlow, ControlAnalysesAStaleFrameOnlyOnce) {
   auto host = openGlHost();
   host->renderFrame(greyPicture());  // nothing attached: results marked stale
