@@ -12,5 +12,6 @@ done
 
 "$root/scripts/build.sh" "$@"
 export ASAN_OPTIONS="${ASAN_OPTIONS:-detect_leaks=1:strict_string_checks=1}"
+export LSAN_OPTIONS="${LSAN_OPTIONS:-suppressions=$root/tests/sanitizer/lsan.supp}"
 export UBSAN_OPTIONS="${UBSAN_OPTIONS:-print_stacktrace=1}"
 ctest --test-dir "$build_dir" --output-on-failure --no-tests=error -j "$(nproc)"
