@@ -69,7 +69,13 @@ int runRender(const CommandLine& line, const PluginModule& module) {
   for (const auto& [id, value] : line.settings) {
     host.setValueFromText(id, value);
   }
-  writePng(line.output, host.renderFrame(layer, line.asFloat));
+  // As the editor does with the effect's panel open: the scope control is attached while the
+  // frame renders, and drawn on the interface thread afterwards.
+  host.attachControl();
+  const Image output = host.renderFrame(layer, line.asFloat);
+  host.drawControl({});
+  host.detachControl();
+  writePng(line.output, output);
   warnAboutUnknownIds(host);
   return 0;
 }
