@@ -2,6 +2,8 @@
 # Installs every Debian package the project needs to build, test and run, and nothing when all
 # are present. Safe to run again; uses sudo when not run as root.
 set -euo pipefail
+#   scripts/setup.sh          what building and testing need
+#   scripts/setup.sh --bench  also what the benchmarks compare against
 
 packages=(
   build-essential cmake ninja-build pkg-config binutils clang-format
@@ -10,6 +12,9 @@ packages=(
   libpng-dev unicode-data
   libgtest-dev libgmock-dev libbenchmark-dev
 )
+if [[ "${1:-}" == "--bench" ]]; then
+  packages+=(ffmpeg)
+fi
 
 missing=()
 for package in "${packages[@]}"; do
