@@ -3,6 +3,7 @@
 #include <GL/glew.h>
 
 #include <array>
+#include <cstdio>
 #include <stdexcept>
 
 #include "host_callbacks.h"
@@ -130,6 +131,48 @@ int32_t EffectHost::changeParentLayer(int32_t width, int32_t height) {
   const int32_t result = changeParameter(kParentLayerName);
   record_.messageRecord = nullptr;
   return result;
+}
+
+void EffectHost::setComparisonLayer(const Image& picture, bool asFloat) {
+  constexpr char kOverlayLayer[] = "overlayLayer";
+  if (picture.rgba.empty()) {
+    chosenLayers_.erase(kOverlayLayer);
+  } else {
+    auto layer = std::make_unique<HostLayer>();
+    layer->info.frameCount = 1;
+    layer->info.width = picture.width;
+    layer->info.height = picture.height;
+    char identifier[40];
+    std::snprintf(identifier, sizeof identifier, "c0a1b2c3-0000-4000-8000-%012zu", layers_.size());
+    layer->identifier = identifier;
+    layer->picture = picture;
+    layer->asFloat = asFloat || picture.bitDepth == 16;
+    chosenLayers_[kOverlayLayer] = layer.get();
+    layers_.push_back(std::move(layer));
+  }
+  expectHandled(kMessageParameterChanged, changeParameter(kOverlayLayer), "react to the layer");
+}
+
+const HostLayer* EffectHost::chosenLayer(const std::string& id) const {
+  const auto found = chosenLayers_.find(id);
+  return found != chosenLayers_.end() ? found->second : nullptr;
+}
+
+const HostLayer* EffectHost::findLayer(const std::string& identifier) const {
+  for (const auto& layer : layers_) {
+    if (!identifier.empty() && layer->identifier == identifier) {
+      return layer.get();
+    }
+  }
+  return nullptr;
+}
+
+HostTexture EffectHost::fetchLayer(const HostLayer& layer, int32_t frameIndex) {
+  if (layer.picture.rgba.empty() || frameIndex < 0 || frameIndex >= layer.info.frameCount) {
+    return HostTexture{};
+  }
+  workingTextures_.push_back(uploadLayer(layer.picture, layer.asFloat, settings_.padTextures));
+  return workingTextures_.back();
 }
 
 void EffectHost::setValueFromText(const std::string& id, const std::string& text) {

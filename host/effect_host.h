@@ -64,6 +64,9 @@ struct ControlOptions {
 // A layer the host can report to the effect (message 7 with "Effect_Parent_Layer").
 struct HostLayer {
   HostLayerInfo info{};
+  std::string identifier;  // 36 characters
+  Image picture;           // what fetchLayer hands out; empty for layers without pixels
+  bool asFloat = false;
 };
 
 class EffectHost {
@@ -88,6 +91,15 @@ class EffectHost {
   int32_t editParameter(const std::string& id, int32_t message = kMessageParameterEdited);
   // Message 7 "Effect_Parent_Layer" with a layer of this size.
   int32_t changeParentLayer(int32_t width, int32_t height);
+  // Chooses a layer of this picture as the comparison layer ("overlayLayer"), or none for an
+  // empty picture, then reports the change as a user's pick.
+  void setComparisonLayer(const Image& picture, bool asFloat = false);
+  // The layer chosen for a layer parameter, or null.
+  const HostLayer* chosenLayer(const std::string& id) const;
+  const HostLayer* findLayer(const std::string& identifier) const;
+  // A texture of the layer's picture in the calling thread's context, released like working
+  // textures; a name of 0 when the layer has no pixels for that frame.
+  HostTexture fetchLayer(const HostLayer& layer, int32_t frameIndex);
   // A user's edit: the value from text, then messages 7 and 13. Throws HostError.
   void setValueFromText(const std::string& id, const std::string& text);
   // Message 10 for one frame of `layer` (8-bit storage, or float storage when asked or when the
@@ -140,6 +152,7 @@ class EffectHost {
   std::string changedId_;
   HostLayerReference layerReference_{};
   std::vector<std::unique_ptr<HostLayer>> layers_;
+  std::map<std::string, const HostLayer*> chosenLayers_;  // by layer parameter id
   std::vector<std::string> unknownIds_;
   int declarationsSeen_ = 0;
   int redrawRequests_ = 0;

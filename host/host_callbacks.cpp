@@ -340,12 +340,32 @@ void* getLayer(HostContext context, const char* id, int32_t time, int32_t layerA
   EffectHost& host = hostOf(context);
   host.enterCallback("getLayer");
   readNumbers(host, id);  // notes an unknown id
+  const HostLayer* layer = id != nullptr ? host.chosenLayer(id) : nullptr;
   if (identifierOut != nullptr) {
-    std::memcpy(identifierOut, kNoLayerIdentifier, kIdentifierChars);
+    std::memcpy(identifierOut, layer != nullptr ? layer->identifier.c_str() : kNoLayerIdentifier,
+                kIdentifierChars);
   }
   host.trace().callback("getLayer", readArguments(id, time) + ", " + std::to_string(layerArgument),
-                        "null");
-  return nullptr;
+                        layer != nullptr ? inQuotes(layer->identifier) : "none");
+  return const_cast<HostLayer*>(layer);
+}
+
+int32_t fetchLayer(HostContext context, const void*, const char* identifier, int32_t frameIndex,
+                   HostTexture* out) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback("fetchLayer");
+  const std::string name =
+      identifier != nullptr ? std::string(identifier, strnlen(identifier, kIdentifierChars)) : "";
+  const HostLayer* layer = host.findLayer(name);
+  const HostTexture texture =
+      layer != nullptr ? host.fetchLayer(*layer, frameIndex) : HostTexture{};
+  if (out != nullptr) {
+    *out = texture;
+  }
+  const int32_t status = texture.name != 0 ? 0 : 1;
+  host.trace().callback("fetchLayer", inQuotes(name) + ", frame " + std::to_string(frameIndex),
+                        std::to_string(status));
+  return status;
 }
 
 int32_t getLayerInfo(HostContext context, const void* layer, int32_t time, HostLayerInfo* out) {
@@ -508,6 +528,7 @@ void installCallbacks(HostEffectRecord& record) {
   record.redrawControl = redrawControl;
   record.allocateTexture = allocateTexture;
   record.fetchOwnLayer = fetchOwnLayer;
+  record.fetchLayer = fetchLayer;
   record.releaseLayer = releaseLayer;
   record.vertexArray = vertexArray;
   record.createBuffer = createBuffer;

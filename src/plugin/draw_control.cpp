@@ -6,6 +6,7 @@
 #include "plugin/instance_lifecycle.h"
 #include "plugin/scopes_effect_data.h"
 #include "plugin/waveform_results.h"
+#include "scope/comparison_layer.h"
 #include "scope/parameter_ids.h"
 #include "scope/waveform_analysis.h"
 
@@ -21,15 +22,52 @@ Plugin::gl::Matrix4 orthographic(float width, float height) {
   return {2.0f / width, 0, 0, 0, 0, 2.0f / height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
 }
 
-// The own layer of the control's frame, fetched from the host and analysed with "WaveformUI".
+// A fetched layer analysed with "WaveformUI" over its own size.
+std::shared_ptr<Plugin::gl::Texture> analyseFetchedLayer(const HostCalls& host,
+                                                         ScopesEffectData& instance,
+                                                         const vtpl::HostTexture& layer,
+                                                         int32_t time) {
+  const float width = static_cast<float>(layer.width);
+  const float height = static_cast<float>(layer.height);
+  const Plugin::gl::Matrix4 projection = orthographic(width, height);
+  const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+  AnalysisInput input;
+  input.layer = layer;
+  input.target = acquireTexture(
+      instance, layer.width, waveformTextureHeight(layer.format, layer.height), layer.format, 1.0f);
+  input.time = time;
+  input.frameWidth = static_cast<int32_t>(layer.width);
+  input.frameHeight = static_cast<int32_t>(layer.height);
+  input.projection = projection.data();
+  input.modelView = identity.data();
+  input.interfaceProgram = true;
+  analyseLayer(host,
+               {instance, instance.stencilPool, instance.resourceLock, instance.instancedDrawing},
+               input);
+  return input.target;
+}
+
+// The control's frame analysed on this thread: the comparison layer and the own layer, fetched
+// from the host and handed back afterwards.
 void analyseOnInterfaceThread(const HostCalls& host, ScopesEffectData& instance,
                               ScopesSharedData& shared, const vtpl::HostControlRecord& control) {
+  const vtpl::HostTexture comparison =
+      fetchComparisonLayer(host, control.time, 0, control.frameIndex);
   const bool showComparison =
       host.call(&HostEffectRecord::getBool, ParamId::kShowComparison, control.time) != 0;
   const int32_t type = host.call(&HostEffectRecord::getInt, ParamId::kScopeComparisonType, 0);
-  const LayerChoice layers = chooseLayers(false, type, showComparison);
+  const LayerChoice layers = chooseLayers(comparison.name != 0, type, showComparison);
   shared.analysedFrame = control.frameIndex;
-  storeResult(shared, &ScopesSharedData::comparison, nullptr, 1, 1);
+  if (layers.comparison) {
+    storeResult(shared, &ScopesSharedData::comparison,
+                analyseFetchedLayer(host, instance, comparison, control.time),
+                static_cast<int32_t>(comparison.width), static_cast<int32_t>(comparison.height));
+  } else {
+    storeResult(shared, &ScopesSharedData::comparison, nullptr, 1, 1);
+  }
+  if (comparison.name != 0) {
+    host.call(&HostEffectRecord::releaseLayer, nullptr, comparison.name);
+  }
   if (!layers.own) {
     storeResult(shared, &ScopesSharedData::primary, nullptr, 1, 1);
     return;
@@ -39,25 +77,9 @@ void analyseOnInterfaceThread(const HostCalls& host, ScopesEffectData& instance,
   if (own.name == 0) {
     return;
   }
-  const float width = static_cast<float>(own.width);
-  const float height = static_cast<float>(own.height);
-  const Plugin::gl::Matrix4 projection = orthographic(width, height);
-  const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
-  AnalysisInput input;
-  input.layer = own;
-  input.target = acquireTexture(instance, own.width, waveformTextureHeight(own.format, own.height),
-                                own.format, 1.0f);
-  input.time = control.time;
-  input.frameWidth = static_cast<int32_t>(own.width);
-  input.frameHeight = static_cast<int32_t>(own.height);
-  input.projection = projection.data();
-  input.modelView = identity.data();
-  input.interfaceProgram = true;
-  analyseLayer(host,
-               {instance, instance.stencilPool, instance.resourceLock, instance.instancedDrawing},
-               input);
-  storeResult(shared, &ScopesSharedData::primary, input.target, input.frameWidth,
-              input.frameHeight);
+  storeResult(shared, &ScopesSharedData::primary,
+              analyseFetchedLayer(host, instance, own, control.time),
+              static_cast<int32_t>(own.width), static_cast<int32_t>(own.height));
   host.call(&HostEffectRecord::releaseLayer, nullptr, own.name);
 }
 

@@ -7,6 +7,7 @@
 #include "plugin/instance_lifecycle.h"
 #include "plugin/scopes_effect_data.h"
 #include "plugin/waveform_results.h"
+#include "scope/comparison_layer.h"
 #include "scope/parameter_choices.h"
 #include "scope/parameter_ids.h"
 #include "scope/waveform_analysis.h"
@@ -35,24 +36,23 @@ class Progress {
   bool stopped_ = false;
 };
 
-// The effect's own layer, analysed into a new waveform texture modelled on the output.
-std::shared_ptr<Plugin::gl::Texture> analyseOwnLayer(const HostCalls& host,
-                                                     ScopesEffectData& instance,
-                                                     const vtpl::HostRenderRecord& frame,
-                                                     bool fullFrame) {
-  const vtpl::HostTexture& output = *frame.destination;
-  auto target =
-      acquireTexture(instance, output.width, waveformTextureHeight(output.format, output.height),
-                     output.format, frame.textureScale);
+// A layer of the frame analysed into a new waveform texture of the output's format, as wide as
+// the reference size and as high as the output's format and the reference height ask.
+std::shared_ptr<Plugin::gl::Texture> analyseFrameLayer(
+    const HostCalls& host, ScopesEffectData& instance, const vtpl::HostRenderRecord& frame,
+    const vtpl::HostTexture& layer, const vtpl::HostTexture& reference, bool fullFrame) {
+  const uint32_t format = frame.destination->format;
   AnalysisInput input;
-  input.layer = *frame.source;
-  input.target = target;
+  input.layer = layer;
+  input.target =
+      acquireTexture(instance, reference.width, waveformTextureHeight(format, reference.height),
+                     format, frame.textureScale);
   input.fullFrame = fullFrame;
   input.time = frame.time;
   input.frameWidth = frame.frameWidth;
   input.frameHeight = frame.frameHeight;
-  input.layerScale[0] = frame.frameWidth > 0 ? float(frame.source->width) / frame.frameWidth : 1;
-  input.layerScale[1] = frame.frameHeight > 0 ? float(frame.source->height) / frame.frameHeight : 1;
+  input.layerScale[0] = frame.frameWidth > 0 ? float(layer.width) / frame.frameWidth : 1;
+  input.layerScale[1] = frame.frameHeight > 0 ? float(layer.height) / frame.frameHeight : 1;
   input.renderScaleX = frame.renderScaleX;
   input.renderScaleY = frame.renderScaleY;
   input.projection = frame.projection;
@@ -61,7 +61,7 @@ std::shared_ptr<Plugin::gl::Texture> analyseOwnLayer(const HostCalls& host,
   analyseLayer(host,
                {instance, instance.stencilPool, instance.resourceLock, instance.instancedDrawing},
                input);
-  return target;
+  return input.target;
 }
 
 // Steps 3 to 6 of a frame: decide, analyse, publish.
@@ -78,20 +78,33 @@ void analyseAndPublish(const HostCalls& host, ScopesEffectData& instance, Scopes
     }
     return;
   }
-  // The comparison layer is fetched once composition with a second layer is in place; until
-  // then it counts as absent.
+  const vtpl::HostTexture comparison =
+      fetchComparisonLayer(host, frame.time, frame.layerArgument, frame.frameIndex);
   const bool showComparison =
       host.call(&HostEffectRecord::getBool, ParamId::kShowComparison, frame.time) != 0;
   const int32_t type = host.call(&HostEffectRecord::getInt, ParamId::kScopeComparisonType, 0);
-  const LayerChoice layers = chooseLayers(false, type, showComparison);
+  const LayerChoice layers = chooseLayers(comparison.name != 0, type, showComparison);
 
   if (!progress.report(10)) {
     shared.analysedFrame = frame.frameIndex;
   }
-  storeResult(shared, &ScopesSharedData::comparison, nullptr, 1, 1);
+  if (layers.comparison) {
+    auto waveform = analyseFrameLayer(host, instance, frame, comparison, comparison, noIdentifier);
+    if (!progress.report(40)) {
+      storeResult(shared, &ScopesSharedData::comparison, std::move(waveform), frame.frameWidth,
+                  frame.frameHeight);
+    }
+  } else {
+    storeResult(shared, &ScopesSharedData::comparison, nullptr, 1, 1);
+  }
+  // A fetched layer goes back to the host whether or not it was analysed.
+  if (comparison.name != 0) {
+    host.call(&HostEffectRecord::releaseLayer, &frame, comparison.name);
+  }
   progress.report(50);
   if (layers.own && !progress.stopped()) {
-    auto waveform = analyseOwnLayer(host, instance, frame, noIdentifier);
+    auto waveform =
+        analyseFrameLayer(host, instance, frame, *frame.source, *frame.destination, noIdentifier);
     if (!progress.report(80)) {
       storeResult(shared, &ScopesSharedData::primary, std::move(waveform), frame.frameWidth,
                   frame.frameHeight);

@@ -108,6 +108,44 @@ TEST(RenderFlow, StoppedRenderWithoutIdentifierKeepsTheResults) {
   }
 }
 
+TEST(RenderFlow, ComparisonLayerIsAnalysedAsTheRenderModeAsks) {
+  struct Case {
+    bool comparison;
+    int32_t type;
+    bool show;
+    int analyses;
+  };
+  const Case cases[] = {
+      {false, 0, true, 1}, {true, 0, true, 2},  {true, 1, false, 2},
+      {true, 2, true, 1},  {true, 2, false, 1}, {false, 2, true, 1},
+  };
+  for (const Case& c : cases) {
+    const std::string what = "comparison " + std::to_string(c.comparison) + ", type " +
+                             std::to_string(c.type) + ", show " + std::to_string(c.show);
+    for (const bool onInterfaceThread : {false, true}) {
+      auto host = openGlHost();
+      host->parameters().writeInt("scopeComparisonType", c.type);
+      host->parameters().writeBool("showComparison", c.show);
+      if (c.comparison) {
+        host->setComparisonLayer(greyPicture());
+      }
+      if (onInterfaceThread) {
+        host->renderFrame(greyPicture());  // nothing attached: the control analyses
+        host->drawControl({});
+      } else {
+        host->attachControl();
+        host->renderFrame(greyPicture());
+      }
+      EXPECT_EQ(analyses(*host), c.analyses) << what << " interface " << onInterfaceThread;
+      EXPECT_EQ(host->callbackCount("fetchLayer"), c.comparison ? 1 : 0) << what;
+      // Every layer fetched from the host goes back to it.
+      EXPECT_EQ(host->callbackCount("releaseLayer"),
+                host->callbackCount("fetchLayer") + ownLayerFetches(*host))
+          << what;
+    }
+  }
+}
+
 TEST(RenderFlow, ControlAnalysesAStaleFrameOnlyOnce) {
   auto host = openGlHost();
   host->renderFrame(greyPicture());  // nothing attached: results marked stale
