@@ -167,9 +167,8 @@ int main(int argc, char** argv) {
           vtpl::host::writePng(png, image);
         }
         vtpl::HostTexture layer = upload(image, asFloat);
-        const Plugin::gl::Matrix4 projection = {
-            2.0f / width, 0, 0, 0, 0, 2.0f / height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
-        const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+        const Plugin::gl::Matrix4 projection =
+            Plugin::gl::orthographicMatrix(float(width), float(height));
         for (const int32_t mode : {kModeLuminance, kModeRGB, kModeCbCr}) {
           const double reference = options.ffmpeg ? ffmpegMilliseconds(png, mode, asFloat) : -1;
           for (const int32_t downsample : downsamples) {
@@ -187,7 +186,7 @@ int main(int argc, char** argv) {
             input.frameWidth = width;
             input.frameHeight = height;
             input.projection = projection.data();
-            input.modelView = identity.data();
+            input.modelView = Plugin::gl::kIdentityMatrix.data();
             std::vector<double> times;
             for (int run = 0; run < options.runs; ++run) {
               glFinish();

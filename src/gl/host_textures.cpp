@@ -88,6 +88,10 @@ Matrix4 multiplyMatrices(const Matrix4& a, const Matrix4& b) {
   return product;
 }
 
+Matrix4 orthographicMatrix(float width, float height) {
+  return {2.0f / width, 0, 0, 0, 0, 2.0f / height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
+}
+
 vtpl::HostTexture acquireWorkingTexture(const HostCalls& host, GLuint width, GLuint height,
                                         bool wantFloat, bool hostFlag) {
   vtpl::HostTexture texture = workingTemplate(host.record());

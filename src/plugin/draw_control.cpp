@@ -18,10 +18,6 @@ using vtpl::HostEffectRecord;
 
 constexpr char kControlId[] = "waveformControl";
 
-Plugin::gl::Matrix4 orthographic(float width, float height) {
-  return {2.0f / width, 0, 0, 0, 0, 2.0f / height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
-}
-
 // A fetched layer analysed with "WaveformUI" over its own size.
 std::shared_ptr<Plugin::gl::Texture> analyseFetchedLayer(const HostCalls& host,
                                                          ScopesEffectData& instance,
@@ -29,8 +25,7 @@ std::shared_ptr<Plugin::gl::Texture> analyseFetchedLayer(const HostCalls& host,
                                                          int32_t time) {
   const float width = static_cast<float>(layer.width);
   const float height = static_cast<float>(layer.height);
-  const Plugin::gl::Matrix4 projection = orthographic(width, height);
-  const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+  const Plugin::gl::Matrix4 projection = Plugin::gl::orthographicMatrix(width, height);
   AnalysisInput input;
   input.layer = layer;
   input.target = acquireTexture(
@@ -39,7 +34,7 @@ std::shared_ptr<Plugin::gl::Texture> analyseFetchedLayer(const HostCalls& host,
   input.frameWidth = static_cast<int32_t>(layer.width);
   input.frameHeight = static_cast<int32_t>(layer.height);
   input.projection = projection.data();
-  input.modelView = identity.data();
+  input.modelView = Plugin::gl::kIdentityMatrix.data();
   input.interfaceProgram = true;
   analyseLayer(host,
                {instance, instance.stencilPool, instance.resourceLock, instance.instancedDrawing},

@@ -170,10 +170,6 @@ struct Frame {
   GLsizei width, height;
 };
 
-Matrix4 orthographic(Frame frame) {
-  return {2.0f / frame.width, 0, 0, 0, 0, 2.0f / frame.height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
-}
-
 // A host texture of the frame's size inside storage of `allocated` size, holding `pixels`.
 template <typename Pixel>
 vtpl::HostTexture uploadTexture(Frame frame, Frame allocated, GLenum internalFormat, GLenum type,
@@ -225,13 +221,12 @@ struct CopyRun {
   CopyRun(vtpl::HostTexture source, Frame frame, GLenum outputFormat, GLenum type) {
     ensureCopyAndClearPrograms(programs, false);
     output = uploadTexture(frame, frame, outputFormat, type, std::vector<float>{});
-    const Matrix4 projection = orthographic(frame);
-    const Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+    const Matrix4 projection = orthographicMatrix(float(frame.width), float(frame.height));
     vtpl::HostRenderRecord render{};
     render.source = &source;
     render.destination = &output;
     render.projection = projection.data();
-    render.modelView = identity.data();
+    render.modelView = kIdentityMatrix.data();
     render.frameWidth = frame.width;
     render.frameHeight = frame.height;
     host.record().messageRecord = &render;

@@ -54,9 +54,7 @@ TEST(PublishedResults, InterfaceThreadReadsWhatTheRenderThreadAnalysed) {
     ensureAnalysisPrograms(programs, false);
     Plugin::gl::StencilBufferList pool;
     std::recursive_mutex lock;
-    const Plugin::gl::Matrix4 projection = {
-        2.0f / kWidth, 0, 0, 0, 0, 2.0f / kHeight, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
-    const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+    const Plugin::gl::Matrix4 projection = Plugin::gl::orthographicMatrix(kWidth, kHeight);
     AnalysisInput input;
     input.layer = layer;
     input.target = Plugin::gl::Texture::create();
@@ -65,7 +63,7 @@ TEST(PublishedResults, InterfaceThreadReadsWhatTheRenderThreadAnalysed) {
     input.frameWidth = kWidth;
     input.frameHeight = kHeight;
     input.projection = projection.data();
-    input.modelView = identity.data();
+    input.modelView = Plugin::gl::kIdentityMatrix.data();
     const Plugin::gl::FBO framebuffer;
     glBindFramebuffer(GL_FRAMEBUFFER, framebuffer.name());
     glClearColor(0, 0, 0, 0);

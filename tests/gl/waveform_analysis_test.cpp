@@ -95,9 +95,7 @@ Waveform analyse(const Frame& frame, const Settings& settings) {
   Plugin::gl::StencilBufferList pool;
   std::recursive_mutex lock;
   const float w = static_cast<float>(frame.width), h = static_cast<float>(frame.height);
-  const Plugin::gl::Matrix4 projection = {2 / w, 0, 0,  0, 0,  2 / h, 0, 0,
-                                          0,     0, -1, 0, -1, -1,    0, 1};
-  const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+  const Plugin::gl::Matrix4 projection = Plugin::gl::orthographicMatrix(w, h);
   AnalysisInput input;
   input.layer = layer;
   input.target = target;
@@ -106,7 +104,7 @@ Waveform analyse(const Frame& frame, const Settings& settings) {
   input.frameWidth = frame.width;
   input.frameHeight = frame.height;
   input.projection = projection.data();
-  input.modelView = identity.data();
+  input.modelView = Plugin::gl::kIdentityMatrix.data();
 
   const Plugin::gl::FBO framebuffer;
   glBindFramebuffer(GL_FRAMEBUFFER, framebuffer.name());

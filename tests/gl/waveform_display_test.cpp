@@ -35,10 +35,9 @@ std::vector<Pixel> display(const std::vector<Pixel>& stored, DisplayIndex index)
   Plugin::gl::EffectData programs;
   ensureWaveformDisplayPrograms(programs, false);
   const float w = static_cast<float>(width);
-  const Plugin::gl::Matrix4 projection = {2 / w, 0, 0, 0, 0, 2, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
-  const Plugin::gl::Matrix4 identity = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
+  const Plugin::gl::Matrix4 projection = Plugin::gl::orthographicMatrix(w, 1);
   drawWaveformDisplay(host.calls(), programs, textures[0], {0, 0, w, 1}, index, projection,
-                      identity);
+                      Plugin::gl::kIdentityMatrix);
 
   std::vector<Pixel> shown(stored.size());
   glReadPixels(0, 0, width, 1, GL_RGBA, GL_FLOAT, shown.data());
