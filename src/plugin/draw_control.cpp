@@ -36,9 +36,7 @@ std::shared_ptr<Plugin::gl::Texture> analyseFetchedLayer(const HostCalls& host,
   input.projection = projection.data();
   input.modelView = Plugin::gl::kIdentityMatrix.data();
   input.interfaceProgram = true;
-  analyseLayer(host,
-               {instance, instance.stencilPool, instance.resourceLock, instance.instancedDrawing},
-               input);
+  analyseLayer(host, analysisResources(instance), input);
   return input.target;
 }
 

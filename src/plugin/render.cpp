@@ -58,9 +58,7 @@ std::shared_ptr<Plugin::gl::Texture> analyseFrameLayer(
   input.projection = frame.projection;
   input.modelView = frame.modelView;
   input.linearInput = frame.linearLight != 0;
-  analyseLayer(host,
-               {instance, instance.stencilPool, instance.resourceLock, instance.instancedDrawing},
-               input);
+  analyseLayer(host, analysisResources(instance), input);
   return input.target;
 }
 

@@ -29,6 +29,10 @@ std::shared_ptr<Plugin::gl::Texture> acquireTexture(ScopesEffectData& instance, 
   return texture;
 }
 
+AnalysisResources analysisResources(ScopesEffectData& instance) {
+  return {instance, instance.stencilPool, instance.resourceLock, instance.instancedDrawing};
+}
+
 void storeResult(ScopesSharedData& shared, WaveformResult ScopesSharedData::*slot,
                  std::shared_ptr<Plugin::gl::Texture> texture, int32_t width, int32_t height) {
   const std::lock_guard<std::mutex> guard(shared.lock);

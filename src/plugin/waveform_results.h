@@ -8,6 +8,7 @@
 
 #include "gl/texture.h"
 #include "plugin/scopes_shared_data.h"
+#include "scope/waveform_analysis.h"
 
 namespace plugin::Scopes {
 
@@ -29,6 +30,9 @@ LayerChoice chooseLayers(bool comparisonPresent, int32_t comparisonType, bool sh
 std::shared_ptr<Plugin::gl::Texture> acquireTexture(ScopesEffectData& instance, uint32_t width,
                                                     uint32_t height, uint32_t internalFormat,
                                                     float scale);
+
+// What the analysis pass uses of the instance.
+AnalysisResources analysisResources(ScopesEffectData& instance);
 
 // Publishes a result: fenced first, so that a reader on the other context waits for it.
 void storeResult(ScopesSharedData& shared, WaveformResult ScopesSharedData::*slot,
