@@ -7,7 +7,10 @@
 namespace vtpl::host {
 namespace {
 
-const std::vector<std::string> kCommands = {"info", "render", "help"};
+const std::vector<std::string> kCommands = {"info", "render", "demo", "help"};
+
+// The most pixels a side of the scope control may have: the size every GL 4.1 driver allows.
+constexpr long kLargestControlSide = 16384;
 
 // The value of an option given as "--name=value" or as "--name value".
 std::string optionValue(const std::vector<std::string>& arguments, size_t& index,
@@ -36,10 +39,44 @@ int32_t parseVersion(const std::string& text) {
   return static_cast<int32_t>(value);
 }
 
+// One side of "WxH": digits only, from 1 to the largest side.
+int32_t parseSide(const std::string& digits, const std::string& size) {
+  const bool allDigits = !digits.empty() && digits.size() <= 5 &&
+                         digits.find_first_not_of("0123456789") == std::string::npos;
+  const long value = allDigits ? std::strtol(digits.c_str(), nullptr, 10) : 0;
+  if (value < 1 || value > kLargestControlSide) {
+    throw UsageError("--control-size takes WIDTHxHEIGHT, each from 1 to " +
+                     std::to_string(kLargestControlSide) + ", not '" + size + "'");
+  }
+  return static_cast<int32_t>(value);
+}
+
+void parseControlSize(const std::string& size, CommandLine& line) {
+  const size_t x = size.find('x');
+  line.controlWidth = parseSide(size.substr(0, x), size);
+  line.controlHeight = parseSide(x == std::string::npos ? "" : size.substr(x + 1), size);
+}
+
+// Options that only some commands use are refused elsewhere, so that a mistyped command line
+// does not quietly do less than asked.
+void checkOptionsFit(const CommandLine& line, bool controlSizeGiven) {
+  const bool renders = line.command == "render" || line.command == "demo";
+  if (!line.comparison.empty() && !renders) {
+    throw UsageError("--compare is an option of render and demo");
+  }
+  if (controlSizeGiven && !renders) {
+    throw UsageError("--control-size is an option of render and demo");
+  }
+  if (!line.controlOutput.empty() && line.command != "render") {
+    throw UsageError("--control is an option of render (demo always writes scope.png)");
+  }
+}
+
 }  // namespace
 
 CommandLine parseCommandLine(const std::vector<std::string>& arguments) {
   CommandLine line;
+  bool controlSizeGiven = false;
   for (size_t i = 0; i < arguments.size(); ++i) {
     const std::string& argument = arguments[i];
     if (argument == "--help" || argument == "-h") {
@@ -54,6 +91,13 @@ CommandLine parseCommandLine(const std::vector<std::string>& arguments) {
       line.pad = true;
     } else if (argument == "-o" || isOption(argument, "--output")) {
       line.output = optionValue(arguments, i, argument == "-o" ? "-o" : "--output");
+    } else if (isOption(argument, "--compare")) {
+      line.comparison = optionValue(arguments, i, "--compare");
+    } else if (isOption(argument, "--control-size")) {
+      parseControlSize(optionValue(arguments, i, "--control-size"), line);
+      controlSizeGiven = true;
+    } else if (isOption(argument, "--control")) {
+      line.controlOutput = optionValue(arguments, i, "--control");
     } else if (isOption(argument, "--plugin")) {
       line.plugin = optionValue(arguments, i, "--plugin");
     } else if (isOption(argument, "--host-version")) {
@@ -90,6 +134,10 @@ CommandLine parseCommandLine(const std::vector<std::string>& arguments) {
   if (line.command == "render" && (line.input.empty() || line.output.empty())) {
     throw UsageError("render needs an input picture and -o OUTPUT");
   }
+  if (line.command == "demo" && line.output.empty()) {
+    line.output = std::filesystem::path("out") / "demo";
+  }
+  checkOptionsFit(line, controlSizeGiven);
   return line;
 }
 
@@ -98,7 +146,12 @@ std::string usageText() {
 
 commands:
   info                      print the plug-in's information and its parameter panel
-  render IN.png -o OUT.png  render one frame of the picture through the effect
+  render IN.png -o OUT.png  render one frame of the picture through the effect, with the
+                            scope control attached, then draw the control
+  demo [-o DIR]             the same for a built-in test frame (colour bars over a grey
+                            ramp); writes test-frame.png, output.png (the rendered frame) and
+                            scope.png (the control) into DIR (default out/demo), and prints
+                            their paths
   help                      print this text
 
 options:
@@ -113,10 +166,18 @@ options:
   --trace              log every message and callback, with arguments and results, to
                        standard error
 
-render options:
-  -o, --output PATH    the output picture (PNG, the input's bit depth)
+render and demo options:
+  -o, --output PATH    render: the output picture (PNG, the input's bit depth);
+                       demo: the folder to write into (created when missing)
+  --compare B.png      choose the picture as the comparison layer ("overlayLayer")
+  --control SCOPE.png  render: also write the picture of the scope control (PNG, 8-bit)
+  --control-size WxH   the scope control's size in pixels (default 500x300)
   --float              hold 8-bit pictures in float textures (16-bit ones always are)
   --pad                allocate textures with power-of-two storage
+
+Render to layer: --set blendType=Screen (or another blend) draws the scope into the frame,
+over the rectangle --set scopePositionTL=X,Y --set scopePositionBR=X,Y in frame pixels from
+the frame's centre, x to the right and y up.
 )";
 }
 

@@ -20,11 +20,16 @@ class UsageError : public HostError {
 };
 
 struct CommandLine {
-  std::string command;           // "info", "render" or "help"
-  std::filesystem::path input;   // render: the layer picture
-  std::filesystem::path output;  // render: where the output goes
-  bool asFloat = false;          // render: float storage for 8-bit pictures too
-  bool pad = false;              // render: power-of-two texture storage
+  std::string command;               // "info", "render", "demo" or "help"
+  std::filesystem::path input;       // render: the layer picture
+  std::filesystem::path output;      // render: where the output goes; demo: the folder (out/demo)
+  bool asFloat = false;              // render, demo: float storage for 8-bit pictures too
+  bool pad = false;                  // render, demo: power-of-two texture storage
+  std::filesystem::path comparison;  // render, demo: the comparison layer's picture, if any
+  std::filesystem::path controlOutput;  // render: where the scope control's picture goes, if
+                                        // anywhere
+  int32_t controlWidth = 500;           // render, demo: the scope control's size in pixels
+  int32_t controlHeight = 300;
   std::filesystem::path plugin;  // empty: the module built beside the tool
   bool trace = false;            // log every message and callback to standard error
   bool verbose = false;          // set the host record's verbose flag

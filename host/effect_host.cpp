@@ -24,6 +24,27 @@ std::array<float, 16> orthographic(float width, float height) {
   return {2.0f / width, 0, 0, 0, 0, 2.0f / height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
 }
 
+// The editor's panel for a control: an 8-bit picture of the control's size as the colour
+// target of the interface thread's framebuffer, cleared to transparent black, with the viewport
+// covering it. Whatever the effect leaves there is the control's picture.
+HostTexture attachControlTarget(GLuint framebuffer, const HostControlRecord& control) {
+  HostTexture target = allocateLayerTexture(static_cast<uint32_t>(control.width),
+                                            static_cast<uint32_t>(control.height), false, false);
+  glBindFramebuffer(GL_FRAMEBUFFER, framebuffer);
+  glFramebufferTexture2D(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D, target.name, 0);
+  glViewport(0, 0, control.width, control.height);
+  glDisable(GL_SCISSOR_TEST);
+  glColorMask(GL_TRUE, GL_TRUE, GL_TRUE, GL_TRUE);
+  glClearColor(0, 0, 0, 0);
+  glClear(GL_COLOR_BUFFER_BIT);
+  return target;
+}
+
+void detachControlTarget(GLuint framebuffer) {
+  glBindFramebuffer(GL_FRAMEBUFFER, framebuffer);
+  glFramebufferTexture2D(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D, 0, 0);
+}
+
 }  // namespace
 
 EffectHost::EffectHost(const PluginModule& module, HostSettings settings, std::ostream* trace)
@@ -133,8 +154,9 @@ int32_t EffectHost::changeParentLayer(int32_t width, int32_t height) {
   return result;
 }
 
-void EffectHost::setComparisonLayer(const Image& picture, bool asFloat) {
+HostLayer* EffectHost::setComparisonLayer(const Image& picture, bool asFloat) {
   constexpr char kOverlayLayer[] = "overlayLayer";
+  HostLayer* chosen = nullptr;
   if (picture.rgba.empty()) {
     chosenLayers_.erase(kOverlayLayer);
   } else {
@@ -147,10 +169,12 @@ void EffectHost::setComparisonLayer(const Image& picture, bool asFloat) {
     layer->identifier = identifier;
     layer->picture = picture;
     layer->asFloat = asFloat || picture.bitDepth == 16;
-    chosenLayers_[kOverlayLayer] = layer.get();
+    chosen = layer.get();
+    chosenLayers_[kOverlayLayer] = chosen;
     layers_.push_back(std::move(layer));
   }
   expectHandled(kMessageParameterChanged, changeParameter(kOverlayLayer), "react to the layer");
+  return chosen;
 }
 
 const HostLayer* EffectHost::chosenLayer(const std::string& id) const {
@@ -234,13 +258,41 @@ int32_t EffectHost::drawControl(const ControlOptions& options) {
   control.controlId = kControlId;
   control.width = options.width;
   control.height = options.height;
-  control.labelScaleX = control.labelScaleY = 1.0;
+  control.labelScaleX = control.labelScaleY = options.labelScale;
+  control.backgroundRed = options.background[0];
+  control.backgroundGreen = options.background[1];
+  control.backgroundBlue = options.background[2];
   control.frameIndex = options.frameIndex;
   control.frameCount = options.frameCount;
   control.force = options.force ? 1 : 0;
+
+  GlThread* thread = interfaceThread_.get();
+  const bool drawsPicture = thread != nullptr && options.width > 0 && options.height > 0;
+  controlPicture_ = Image{};
+  HostTexture target{};
+  if (drawsPicture) {
+    thread->run([&] { target = attachControlTarget(thread->framebuffer(), control); });
+  }
+  const auto finish = [&] {
+    if (drawsPicture) {
+      thread->run([&] {
+        controlPicture_ = readLayer(target, 8);
+        detachControlTarget(thread->framebuffer());
+        deleteLayerTexture(target);
+      });
+    }
+  };
   record_.messageRecord = &control;
-  const int32_t result = send(kMessageDrawControl);
+  int32_t result = 0;
+  try {
+    result = send(kMessageDrawControl);
+  } catch (...) {
+    record_.messageRecord = nullptr;
+    finish();
+    throw;
+  }
   record_.messageRecord = nullptr;
+  finish();
   return result;
 }
 

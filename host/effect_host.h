@@ -3,6 +3,7 @@
 #ifndef VTPL_HOST_EFFECT_HOST_H
 #define VTPL_HOST_EFFECT_HOST_H
 
+#include <array>
 #include <cstdint>
 #include <map>
 #include <memory>
@@ -41,6 +42,7 @@ struct HostFaults {
   std::string throwInCallback;    // throw from the callback of this name (as the trace names it)
   bool throwNonStandard = false;  // throw an int instead of a std::runtime_error
   bool failLayerInfo = false;     // getLayerInfo answers with a failure status
+  bool failFetchLayer = false;    // fetchLayer answers a failure status and hands out no texture
   int stopAtProgress = -1;        // progress asks to stop from this many steps done on
 };
 
@@ -57,8 +59,10 @@ struct ControlOptions {
   int32_t frameCount = 1;
   bool force = false;
   bool noIdentifier = false;
-  int32_t width = 250;
+  int32_t width = 250;  // pixels
   int32_t height = 150;
+  std::array<double, 3> background = {0.15, 0.15, 0.15};  // the panel's colour, red, green, blue
+  double labelScale = 1.0;                                // the interface's text scale
 };
 
 // A layer the host can report to the effect (message 7 with "Effect_Parent_Layer").
@@ -92,8 +96,9 @@ class EffectHost {
   // Message 7 "Effect_Parent_Layer" with a layer of this size.
   int32_t changeParentLayer(int32_t width, int32_t height);
   // Chooses a layer of this picture as the comparison layer ("overlayLayer"), or none for an
-  // empty picture, then reports the change as a user's pick.
-  void setComparisonLayer(const Image& picture, bool asFloat = false);
+  // empty picture, then reports the change as a user's pick. Returns the new layer (null when
+  // cleared), which stays the host's and may be changed (its kind, its frame count) later on.
+  HostLayer* setComparisonLayer(const Image& picture, bool asFloat = false);
   // The layer chosen for a layer parameter, or null.
   const HostLayer* chosenLayer(const std::string& id) const;
   const HostLayer* findLayer(const std::string& identifier) const;
@@ -108,8 +113,14 @@ class EffectHost {
   // Messages 1001 and 1002, as the editor sends them while a scope panel is open.
   int32_t attachControl() { return send(kMessageAttach); }
   int32_t detachControl() { return send(kMessageDetach); }
-  // Message 1003 for the scope control, on the interface thread.
+  // Message 1003 for the scope control, on the interface thread. With GL, the control is drawn
+  // into an 8-bit texture of its size, attached to the thread's framebuffer, cleared to
+  // transparent black and with the viewport set to it, as the editor prepares its panel; the
+  // picture is read back into controlPicture(). Returns what Notify answered.
   int32_t drawControl(const ControlOptions& options);
+  // The picture of the last control drawing (straight alpha, 8 bits, rows from the top); empty
+  // before the first drawing, without GL, or after a drawing of no size.
+  const Image& controlPicture() const { return controlPicture_; }
 
   HostEffectRecord& record() { return record_; }
   ParameterStore& parameters() { return store_; }
@@ -160,6 +171,7 @@ class EffectHost {
   std::map<std::string, int, std::less<>> callbacksByName_;
   std::vector<HostTexture> workingTextures_;
   Image ownLayer_;  // the picture of the frame last rendered (frame index 0)
+  Image controlPicture_;
   bool ownLayerIsFloat_ = false;
   std::unique_ptr<GlThread> renderThread_;
   std::unique_ptr<GlThread> interfaceThread_;

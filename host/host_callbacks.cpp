@@ -2,6 +2,7 @@
 
 #include <GL/glew.h>
 
+#include <cstddef>
 #include <cstdio>
 #include <cstring>
 
@@ -357,8 +358,9 @@ int32_t fetchLayer(HostContext context, const void*, const char* identifier, int
   const std::string name =
       identifier != nullptr ? std::string(identifier, strnlen(identifier, kIdentifierChars)) : "";
   const HostLayer* layer = host.findLayer(name);
-  const HostTexture texture =
-      layer != nullptr ? host.fetchLayer(*layer, frameIndex) : HostTexture{};
+  const HostTexture texture = layer != nullptr && !host.faults().failFetchLayer
+                                  ? host.fetchLayer(*layer, frameIndex)
+                                  : HostTexture{};
   if (out != nullptr) {
     *out = texture;
   }
@@ -367,6 +369,10 @@ int32_t fetchLayer(HostContext context, const void*, const char* identifier, int
                         std::to_string(status));
   return status;
 }
+
+// Effects read the kind, the frame count and the height of the record the host fills.
+static_assert(offsetof(HostLayerInfo, kind) == 0);
+static_assert(offsetof(HostLayerInfo, frameCount) == 4);
 
 int32_t getLayerInfo(HostContext context, const void* layer, int32_t time, HostLayerInfo* out) {
   EffectHost& host = hostOf(context);

@@ -1,10 +1,60 @@
 #!/usr/bin/env bash
-# Builds everything and times the waveform analysis on this machine's GL, with ffmpeg's waveform
-# filter on the same pictures as an outside reference. Arguments go to the benchmark
-# (--runs N, --quick, --no-ffmpeg).
+# Builds everything and runs the benchmarks on this machine's GL:
+#   analysis_bench  the waveform analysis of HD and UHD frames, with ffmpeg's waveform filter on
+#                   the same pictures as an outside reference (--runs N, --quick, --no-ffmpeg,
+#                   --folder DIR)
+#   scope_bench     whole HD frames through the reference host: render, scope control drawing,
+#                   both, for each mode and layout (--runs N)
+#   scripts/bench.sh [--only analysis|scope] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 
+usage() {
+  echo "usage: scripts/bench.sh [--only analysis|scope] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
+  exit 2
+}
+
+only=""
+analysis_arguments=()
+scope_arguments=()
+while (($# > 0)); do
+  case "$1" in
+    --only | --runs | --folder)
+      (($# >= 2)) || usage
+      ;;&
+    --only)
+      only="$2"
+      shift 2
+      ;;
+    --runs)
+      analysis_arguments+=("$1" "$2")
+      scope_arguments+=("$1" "$2")
+      shift 2
+      ;;
+    --folder)
+      analysis_arguments+=("$1" "$2")
+      shift 2
+      ;;
+    --quick | --no-ffmpeg)
+      analysis_arguments+=("$1")
+      shift
+      ;;
+    *)
+      usage
+      ;;
+  esac
+done
+if [[ -n "$only" && "$only" != analysis && "$only" != scope ]]; then
+  echo "bench: --only takes analysis or scope, not '$only'" >&2
+  usage
+fi
+
 "$root/scripts/setup.sh" --bench
 "$root/scripts/build.sh" >/dev/null
-"$root/build/bench/analysis_bench" "$@"
+if [[ "$only" != scope ]]; then
+  "$root/build/bench/analysis_bench" "${analysis_arguments[@]}"
+fi
+if [[ "$only" != analysis ]]; then
+  [[ "$only" == scope ]] || echo
+  "$root/build/bench/scope_bench" "${scope_arguments[@]}"
+fi

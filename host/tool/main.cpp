@@ -1,6 +1,8 @@
 // vtpl-host: loads an effect module the way the editor does and runs one command with it.
+#include <filesystem>
 #include <iostream>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "command_line.h"
@@ -8,6 +10,7 @@
 #include "image.h"
 #include "panel_printer.h"
 #include "plugin_module.h"
+#include "test_frame.h"
 #include "utf16_text.h"
 
 namespace {
@@ -59,8 +62,20 @@ int runInfo(const CommandLine& line, const PluginModule& module) {
   return 0;
 }
 
-int runRender(const CommandLine& line, const PluginModule& module) {
-  const Image layer = readPng(line.input);
+// The size of the demo's test frame: the frame the point parameters' defaults span, so that the
+// analysis and the scope's corners cover it exactly.
+constexpr int kDemoWidth = 1280;
+constexpr int kDemoHeight = 720;
+
+struct RenderedFrame {
+  Image output;
+  Image control;
+};
+
+// Renders one frame of `layer` as the editor does with the effect's panel open: the scope
+// control is attached while the frame renders and drawn on the interface thread afterwards.
+RenderedFrame renderWithControl(const CommandLine& line, const PluginModule& module,
+                                const Image& layer) {
   HostSettings settings = settingsFrom(line);
   settings.gl = true;
   settings.padTextures = line.pad;
@@ -69,14 +84,42 @@ int runRender(const CommandLine& line, const PluginModule& module) {
   for (const auto& [id, value] : line.settings) {
     host.setValueFromText(id, value);
   }
-  // As the editor does with the effect's panel open: the scope control is attached while the
-  // frame renders, and drawn on the interface thread afterwards.
+  if (!line.comparison.empty()) {
+    host.setComparisonLayer(readPng(line.comparison), line.asFloat);
+  }
   host.attachControl();
-  const Image output = host.renderFrame(layer, line.asFloat);
-  host.drawControl({});
+  RenderedFrame frame;
+  frame.output = host.renderFrame(layer, line.asFloat);
+  ControlOptions control;
+  control.width = line.controlWidth;
+  control.height = line.controlHeight;
+  host.drawControl(control);
+  frame.control = host.controlPicture();
   host.detachControl();
-  writePng(line.output, output);
   warnAboutUnknownIds(host);
+  return frame;
+}
+
+int runRender(const CommandLine& line, const PluginModule& module) {
+  const RenderedFrame frame = renderWithControl(line, module, readPng(line.input));
+  writePng(line.output, frame.output);
+  if (!line.controlOutput.empty()) {
+    writePng(line.controlOutput, frame.control);
+  }
+  return 0;
+}
+
+int runDemo(const CommandLine& line, const PluginModule& module) {
+  const Image testFrame = colourBarTestFrame(kDemoWidth, kDemoHeight);
+  const RenderedFrame frame = renderWithControl(line, module, testFrame);
+  std::filesystem::create_directories(line.output);
+  const std::pair<const char*, const Image*> pictures[] = {
+      {"test-frame.png", &testFrame}, {"output.png", &frame.output}, {"scope.png", &frame.control}};
+  for (const auto& [name, picture] : pictures) {
+    const std::filesystem::path path = line.output / name;
+    writePng(path, *picture);
+    std::cout << path.string() << '\n';
+  }
   return 0;
 }
 
@@ -90,7 +133,10 @@ int main(int argc, char** argv) {
       return 0;
     }
     const PluginModule module(line.plugin.empty() ? defaultPluginPath() : line.plugin);
-    return line.command == "render" ? runRender(line, module) : runInfo(line, module);
+    if (line.command == "render") {
+      return runRender(line, module);
+    }
+    return line.command == "demo" ? runDemo(line, module) : runInfo(line, module);
   } catch (const UsageError& error) {
     std::cerr << "vtpl-host: " << error.what() << "\n\n" << usageText();
     return 2;

@@ -9,6 +9,10 @@ namespace Plugin::gl {
 // the platform step has nothing to do there.
 bool initialiseGlew();
 
+// True once initialiseGlew has succeeded in this process. GLEW's entry points are process-wide:
+// before that, every GL call beyond GL 1.1 would jump through a null pointer.
+bool glewLoaded();
+
 }  // namespace Plugin::gl
 
 #endif  // WAVEFORM_GL_GLEW_SETUP_H

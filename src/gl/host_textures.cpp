@@ -89,7 +89,28 @@ Matrix4 multiplyMatrices(const Matrix4& a, const Matrix4& b) {
 }
 
 Matrix4 orthographicMatrix(float width, float height) {
-  return {2.0f / width, 0, 0, 0, 0, 2.0f / height, 0, 0, 0, 0, -1, 0, -1, -1, 0, 1};
+  return orthographicMatrix(0, width, 0, height);
+}
+
+Matrix4 orthographicMatrix(float left, float right, float bottom, float top) {
+  const float width = right - left;
+  const float height = top - bottom;
+  return {2.0f / width,
+          0,
+          0,
+          0,
+          0,
+          2.0f / height,
+          0,
+          0,
+          0,
+          0,
+          -1,
+          0,
+          -(right + left) / width,
+          -(top + bottom) / height,
+          0,
+          1};
 }
 
 vtpl::HostTexture acquireWorkingTexture(const HostCalls& host, GLuint width, GLuint height,

@@ -30,6 +30,8 @@ Matrix4 multiplyMatrices(const Matrix4& a, const Matrix4& b);
 inline constexpr Matrix4 kIdentityMatrix = {1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1, 0, 0, 0, 0, 1};
 // Maps (0, 0)..(width, height) onto the whole viewport, depth -1 to 1.
 Matrix4 orthographicMatrix(float width, float height);
+// Maps (left, bottom)..(right, top) onto the whole viewport, depth -1 to 1.
+Matrix4 orthographicMatrix(float left, float right, float bottom, float top);
 
 // Asks the host for a working texture of this size, modelled on the texture the host record's
 // mode value selects; float storage when asked for and the template is RGBA.

@@ -24,6 +24,9 @@ class Texture {
   // Places a GPU fence after the commands that produced the texture, so that a reader on the
   // other thread's context can wait for them; an earlier fence is waited for and replaced.
   void placeFence();
+  // Makes this context's later commands wait on the GPU for the fenced ones, then drops the
+  // fence. Callers on different threads serialise this with the lock that publishes the texture.
+  void waitAndDeleteFence();
 
   GLuint name() const { return name_; }
   GLsync fence() const { return fence_; }
@@ -33,8 +36,6 @@ class Texture {
   float scale() const { return scale_; }
 
  private:
-  void waitAndDeleteFence();
-
   GLuint name_ = 0;
   GLsync fence_ = nullptr;
   GLuint width_ = 0;

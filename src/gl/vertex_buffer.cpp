@@ -43,4 +43,19 @@ void drawQuadArrays(const HostCalls& host, const float* vertices, GLsizei vertex
   glBindVertexArray(0);
 }
 
+void drawPositionArrays(const HostCalls& host, const float* vertices, GLsizei vertexCount,
+                        GLenum mode) {
+  constexpr GLsizei kPositionStride = 2 * sizeof(float);
+  glBindVertexArray(host.call(&vtpl::HostEffectRecord::vertexArray));
+  {
+    const VertexBufferObjectRAII buffer(
+        host, vertices, static_cast<GLuint>(vertexCount) * kPositionStride, GL_DYNAMIC_DRAW);
+    glEnableVertexAttribArray(kPositionLocation);
+    glVertexAttribPointer(kPositionLocation, 2, GL_FLOAT, GL_FALSE, kPositionStride, nullptr);
+    glDrawArrays(mode, 0, vertexCount);
+    glDisableVertexAttribArray(kPositionLocation);
+  }
+  glBindVertexArray(0);
+}
+
 }  // namespace Plugin::gl

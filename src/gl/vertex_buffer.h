@@ -32,6 +32,9 @@ class VertexBufferObjectRAII {
 // Draws `vertexCount` (x, y, u, v) vertices with position at attribute 0 and texture coordinate
 // at attribute 8, through the host's vertex array and a host buffer.
 void drawQuadArrays(const HostCalls& host, const float* vertices, GLsizei vertexCount, GLenum mode);
+// Draws `vertexCount` (x, y) vertices, position only, at attribute 0.
+void drawPositionArrays(const HostCalls& host, const float* vertices, GLsizei vertexCount,
+                        GLenum mode);
 
 }  // namespace Plugin::gl
 

@@ -8,6 +8,7 @@
 #include "plugin/waveform_results.h"
 #include "scope/comparison_layer.h"
 #include "scope/parameter_ids.h"
+#include "scope/scope_composition.h"
 #include "scope/waveform_analysis.h"
 
 namespace plugin::Scopes {
@@ -76,6 +77,29 @@ void analyseOnInterfaceThread(const HostCalls& host, ScopesEffectData& instance,
   host.call(&HostEffectRecord::releaseLayer, nullptr, own.name);
 }
 
+// The scope as the control shows it: the panel's background around a black waveform panel, the
+// display flags read at time 0, labels in the interface thread's text state.
+ScopeDrawing controlScopeDrawing(const HostCalls& host, const vtpl::HostControlRecord& control) {
+  constexpr int32_t kDisplayTime = 0;
+  ScopeDrawing drawing;
+  drawing.background = {static_cast<float>(control.backgroundRed),
+                        static_cast<float>(control.backgroundGreen),
+                        static_cast<float>(control.backgroundBlue), 1.0f};
+  drawing.showGuidelines =
+      host.call(&HostEffectRecord::getBool, ParamId::kShowGuidelines, kDisplayTime) != 0;
+  drawing.showAxisLabels =
+      host.call(&HostEffectRecord::getBool, ParamId::kShowsAxisLabel, kDisplayTime) != 0;
+  drawing.showColourBars =
+      host.call(&HostEffectRecord::getBool, ParamId::kShowStandardColorBars, kDisplayTime) != 0;
+  drawing.width = static_cast<float>(control.width);
+  drawing.height = static_cast<float>(control.height);
+  drawing.labelScaleX = static_cast<float>(control.labelScaleX);
+  drawing.labelScaleY = static_cast<float>(control.labelScaleY);
+  drawing.fillPanel = true;
+  drawing.interfaceThread = true;
+  return drawing;
+}
+
 }  // namespace
 
 int32_t drawControl(const HostCalls& host, ScopesEffectData& instance) {
@@ -102,7 +126,7 @@ int32_t drawControl(const HostCalls& host, ScopesEffectData& instance) {
       glViewport(viewport[0], viewport[1], viewport[2], viewport[3]);
     }
   }
-  // The scope itself is drawn here once the composition is in place.
+  drawScope(host, instance, takePublishedWaveforms(shared), controlScopeDrawing(host, *control));
   instance.releaseProgram();
   Plugin::gl::unbindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, false);
   glFlush();

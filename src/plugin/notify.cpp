@@ -1,5 +1,6 @@
 #include "plugin/notify.h"
 
+#include "gl/glew_setup.h"
 #include "gl/host_calls.h"
 #include "plugin/draw_control.h"
 #include "plugin/instance_lifecycle.h"
@@ -45,7 +46,7 @@ int32_t handleMessage(HostContext context, HostEffectRecord& record, int32_t mes
       setUp(host, *instanceOf(record));
       return kResultHandled;
     case kMessageRender:
-      if (instanceOf(record) == nullptr) {
+      if (instanceOf(record) == nullptr || !Plugin::gl::glewLoaded()) {
         return kResultNotHandled;
       }
       return render(host, *instanceOf(record));
@@ -62,7 +63,7 @@ int32_t handleMessage(HostContext context, HostEffectRecord& record, int32_t mes
       detachControl(record);
       return kResultHandled;
     case kMessageDrawControl:
-      if (instanceOf(record) == nullptr) {
+      if (instanceOf(record) == nullptr || !Plugin::gl::glewLoaded()) {
         return kResultNotHandled;
       }
       return drawControl(host, *instanceOf(record));

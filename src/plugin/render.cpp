@@ -10,6 +10,7 @@
 #include "scope/comparison_layer.h"
 #include "scope/parameter_choices.h"
 #include "scope/parameter_ids.h"
+#include "scope/render_to_layer.h"
 #include "scope/waveform_analysis.h"
 
 namespace plugin::Scopes {
@@ -64,9 +65,8 @@ std::shared_ptr<Plugin::gl::Texture> analyseFrameLayer(
 
 // Steps 3 to 6 of a frame: decide, analyse, publish.
 void analyseAndPublish(const HostCalls& host, ScopesEffectData& instance, ScopesSharedData& shared,
-                       const vtpl::HostRenderRecord& frame, bool noIdentifier, Progress& progress) {
-  const int32_t blend = host.call(&HostEffectRecord::getInt, ParamId::kBlendType, frame.time);
-  const bool blending = blend != kBlendNone;
+                       const vtpl::HostRenderRecord& frame, bool noIdentifier, bool blending,
+                       Progress& progress) {
   const bool analyse = frame.unwatched != 0
                            ? blending
                            : shared.attachmentCount.load() > 0 || noIdentifier || blending;
@@ -126,12 +126,16 @@ int32_t render(const HostCalls& host, ScopesEffectData& instance) {
   const bool noIdentifier = isNoIdentifier(frame->identifier);
   Progress progress(host);
   progress.report(0);
-  if (ScopesSharedData* shared = sharedDataOf(host.record())) {
-    analyseAndPublish(host, instance, *shared, *frame, noIdentifier, progress);
+  const int32_t blend = host.call(&HostEffectRecord::getInt, ParamId::kBlendType, frame->time);
+  ScopesSharedData* shared = sharedDataOf(host.record());
+  if (shared != nullptr) {
+    analyseAndPublish(host, instance, *shared, *frame, noIdentifier, blend != kBlendNone, progress);
   }
 
   Plugin::gl::copyPass(host, instance, *frame->source, *frame->destination);
-  progress.report(90);
+  if (!progress.report(90) && blend != kBlendNone) {
+    renderToLayer(host, instance, takePublishedWaveforms(shared), *frame, blend);
+  }
 
   // The host expects its output attached, nothing bound on unit 0 and no program in use.
   Plugin::gl::attachTexture(*frame->destination, 0, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D);

@@ -8,16 +8,9 @@
 #include <memory>
 #include <mutex>
 
-#include "gl/resource_types.h"
+#include "scope/waveform_result.h"
 
 namespace plugin::Scopes {
-
-// One published waveform with the frame size it was measured at.
-struct WaveformResult {
-  std::shared_ptr<Plugin::gl::Texture> texture;
-  int32_t width = 0;
-  int32_t height = 0;
-};
 
 // Members are destroyed in reverse order: the comparison texture reference is dropped before the
 // primary one, and the lock last.

@@ -6,6 +6,8 @@
 #include "gl/glew_setup.h"
 #include "gl/plugin_exception.h"
 #include "plugin/scopes_effect_data.h"
+#include "scope/blend_shader.h"
+#include "scope/graticule_drawing.h"
 #include "scope/waveform_analysis.h"
 #include "scope/waveform_display.h"
 
@@ -24,7 +26,9 @@ void setUp(const Plugin::gl::HostCalls& host, ScopesEffectData& instance) {
   }
   instance.instancedDrawing = true;
   ensureAnalysisPrograms(instance, verbose);
+  ensureGuidelineProgram(instance, verbose);
   ensureWaveformDisplayPrograms(instance, verbose);
+  ensureBlendProgram(instance, verbose);
   Plugin::gl::ensureCopyAndClearPrograms(instance, verbose);
 }
 

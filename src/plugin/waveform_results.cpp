@@ -3,7 +3,6 @@
 #include <cstring>
 
 #include "plugin/scopes_effect_data.h"
-#include "scope/parameter_choices.h"
 #include "vtpl/host_interface.h"
 
 namespace plugin::Scopes {
@@ -12,12 +11,6 @@ bool isNoIdentifier(const char* identifier) {
   static constexpr char kNoIdentifier[] = "00000000-0000-0000-0000-000000000000";
   return identifier == nullptr ||
          std::memcmp(identifier, kNoIdentifier, vtpl::kIdentifierChars) == 0;
-}
-
-LayerChoice chooseLayers(bool comparisonPresent, int32_t comparisonType, bool showComparison) {
-  const bool singleScope = comparisonType == kComparisonSingleScope;
-  return {comparisonPresent && (!singleScope || showComparison),
-          !(comparisonPresent && singleScope && showComparison)};
 }
 
 std::shared_ptr<Plugin::gl::Texture> acquireTexture(ScopesEffectData& instance, uint32_t width,
@@ -40,6 +33,22 @@ void storeResult(ScopesSharedData& shared, WaveformResult ScopesSharedData::*slo
     texture->placeFence();
   }
   shared.*slot = WaveformResult{std::move(texture), width, height};
+}
+
+ScopeWaveforms takePublishedWaveforms(ScopesSharedData* shared) {
+  ScopeWaveforms waveforms;
+  if (shared == nullptr) {
+    return waveforms;
+  }
+  const std::lock_guard<std::mutex> guard(shared->lock);
+  waveforms.primary = shared->primary;
+  waveforms.comparison = shared->comparison;
+  for (const WaveformResult* result : {&waveforms.primary, &waveforms.comparison}) {
+    if (result->texture != nullptr) {
+      result->texture->waitAndDeleteFence();
+    }
+  }
+  return waveforms;
 }
 
 }  // namespace plugin::Scopes

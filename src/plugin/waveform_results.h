@@ -8,6 +8,7 @@
 
 #include "gl/texture.h"
 #include "plugin/scopes_shared_data.h"
+#include "scope/scope_layout.h"
 #include "scope/waveform_analysis.h"
 
 namespace plugin::Scopes {
@@ -17,14 +18,6 @@ class ScopesEffectData;
 // True for a null identifier or the all-zero form: a render without identifier, which analyses
 // the whole frame.
 bool isNoIdentifier(const char* identifier);
-
-struct LayerChoice {
-  bool comparison;
-  bool own;
-};
-// Single Scope with "Comparison Layer" on shows only the comparison; otherwise both are shown
-// when present.
-LayerChoice chooseLayers(bool comparisonPresent, int32_t comparisonType, bool showComparison);
 
 // A new texture with storage of this size and format, created under the resource lock.
 std::shared_ptr<Plugin::gl::Texture> acquireTexture(ScopesEffectData& instance, uint32_t width,
@@ -37,6 +30,10 @@ AnalysisResources analysisResources(ScopesEffectData& instance);
 // Publishes a result: fenced first, so that a reader on the other context waits for it.
 void storeResult(ScopesSharedData& shared, WaveformResult ScopesSharedData::*slot,
                  std::shared_ptr<Plugin::gl::Texture> texture, int32_t width, int32_t height);
+
+// The published waveforms, taken under the shared data's lock; this context waits on the GPU
+// for the commands that produced them before anything samples them. None without shared data.
+ScopeWaveforms takePublishedWaveforms(ScopesSharedData* shared);
 
 }  // namespace plugin::Scopes
 

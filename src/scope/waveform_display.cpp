@@ -15,6 +15,7 @@ using Plugin::gl::EffectData;
 
 constexpr char kWaveformSampler[] = "waveformTexture";
 constexpr char kDisplayIndexUniform[] = "displayIndex";
+constexpr char kFillColourUniform[] = "fillColour";
 
 // A GLSL mat3 that multiplies like `rows`: GLSL's constructor takes columns.
 std::string glslMatrix(const Matrix3& rows) {
@@ -87,6 +88,20 @@ void main() {
 }
 )";
 
+void setMatrices(EffectData& programs, const Plugin::gl::Matrix4& projection,
+                 const Plugin::gl::Matrix4& modelView) {
+  programs.setUniformMatrix(programs.uniformLocation(Plugin::gl::kProjectionUniform), 4, 1, false,
+                            projection.data());
+  programs.setUniformMatrix(programs.uniformLocation(Plugin::gl::kModelViewUniform), 4, 1, false,
+                            modelView.data());
+}
+
+// (x, y, u, v) corners of a triangle strip over the rectangle, the texture spanning it once.
+std::array<float, 16> rectangleQuad(const Rectangle& d) {
+  return {d.left, d.bottom, 0, 0, d.right, d.bottom, 1, 0,
+          d.left, d.top,    0, 1, d.right, d.top,    1, 1};
+}
+
 void createQuadProgram(EffectData& programs, const std::string& fragmentSource, bool echo,
                        const char* name) {
   if (programs.programId(name) >= 0) {
@@ -115,18 +130,26 @@ void drawWaveformDisplay(const Plugin::gl::HostCalls& host, EffectData& programs
                          DisplayIndex displayIndex, const Plugin::gl::Matrix4& projection,
                          const Plugin::gl::Matrix4& modelView) {
   programs.useProgram(kCopyWaveformProgram);
-  programs.setUniformMatrix(programs.uniformLocation(Plugin::gl::kProjectionUniform), 4, 1, false,
-                            projection.data());
-  programs.setUniformMatrix(programs.uniformLocation(Plugin::gl::kModelViewUniform), 4, 1, false,
-                            modelView.data());
+  setMatrices(programs, projection, modelView);
   programs.setUniform1i(programs.uniformLocation(kWaveformSampler), 0);
   programs.setUniform1i(programs.uniformLocation(kDisplayIndexUniform), displayIndex);
-  const Rectangle& d = destination;
-  const float quad[16] = {d.left, d.bottom, 0, 0, d.right, d.bottom, 1, 0,
-                          d.left, d.top,    0, 1, d.right, d.top,    1, 1};
+  const std::array<float, 16> quad = rectangleQuad(destination);
   Plugin::gl::bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, waveformTexture, true);
-  Plugin::gl::drawQuadArrays(host, quad, 4, GL_TRIANGLE_STRIP);
+  Plugin::gl::drawQuadArrays(host, quad.data(), 4, GL_TRIANGLE_STRIP);
   Plugin::gl::unbindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, false);
+  programs.releaseProgram();
+}
+
+void fillWaveformPanel(const Plugin::gl::HostCalls& host, EffectData& programs,
+                       const Rectangle& destination, const std::array<float, 4>& colour,
+                       const Plugin::gl::Matrix4& projection,
+                       const Plugin::gl::Matrix4& modelView) {
+  programs.useProgram(kFillWaveformBackgroundProgram);
+  setMatrices(programs, projection, modelView);
+  programs.setUniform4f(programs.uniformLocation(kFillColourUniform), colour[0], colour[1],
+                        colour[2], colour[3]);
+  const std::array<float, 16> quad = rectangleQuad(destination);
+  Plugin::gl::drawQuadArrays(host, quad.data(), 4, GL_TRIANGLE_STRIP);
   programs.releaseProgram();
 }
 

@@ -3,6 +3,7 @@
 #ifndef WAVEFORM_SCOPE_WAVEFORM_DISPLAY_H
 #define WAVEFORM_SCOPE_WAVEFORM_DISPLAY_H
 
+#include <array>
 #include <string>
 
 #include "gl/effect_data.h"
@@ -32,6 +33,12 @@ void drawWaveformDisplay(const Plugin::gl::HostCalls& host, Plugin::gl::EffectDa
                          GLuint waveformTexture, const Rectangle& destination,
                          DisplayIndex displayIndex, const Plugin::gl::Matrix4& projection,
                          const Plugin::gl::Matrix4& modelView);
+
+// Fills `destination` with one premultiplied colour through "fillWaveformBackground", into the
+// bound framebuffer. Blending is the caller's.
+void fillWaveformPanel(const Plugin::gl::HostCalls& host, Plugin::gl::EffectData& programs,
+                       const Rectangle& destination, const std::array<float, 4>& colour,
+                       const Plugin::gl::Matrix4& projection, const Plugin::gl::Matrix4& modelView);
 
 }  // namespace plugin::Scopes
 

@@ -1,12 +1,15 @@
 // Frames rendered through the module on the host's GL threads: the layer reaches the output
-// unchanged, from exact and padded textures, 8-bit and float, even when the host asks to stop.
+// unchanged, from exact and padded textures, 8-bit and float, even when the host asks to stop;
+// and the layers the host serves to the effect while rendering.
 #include <gtest/gtest.h>
 
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
+#include <cstring>
 #include <random>
 #include <string>
+#include <vector>
 
 #include "gl_thread.h"
 #include "image.h"
@@ -113,6 +116,65 @@ TEST(Render, OwnLayerIsFetchedForTheRenderedFrameOnly) {
   EXPECT_EQ(own.uMax, 10.0f / 16.0f);
   EXPECT_EQ(missing.name, 0u);
   expectSamePicture(fetched, input, 1e-6f);
+}
+
+// The comparison layer's information record as the effect reads it: kind at byte 0, frame
+// count at byte 4, height at byte 112; tests may change the layer after choosing it.
+TEST(Render, ComparisonLayerInformationIsWhatTheHostHolds) {
+  auto host = openHost();
+  vtpl::host::HostLayer* layer = host->setComparisonLayer(randomPicture(9, 5, 8, 17));
+  ASSERT_NE(layer, nullptr);
+  const vtpl::HostEffectRecord& record = host->record();
+  char identifier[vtpl::kIdentifierChars] = {};
+  void* handle = record.getLayer(host.get(), "overlayLayer", 0, 0, identifier);
+  ASSERT_EQ(handle, layer);
+  EXPECT_EQ(std::string(identifier, sizeof identifier), layer->identifier);
+
+  const auto readInfo = [&](int32_t expectedStatus) {
+    unsigned char bytes[sizeof(vtpl::HostLayerInfo)] = {};
+    EXPECT_EQ(
+        record.getLayerInfo(host.get(), handle, 0, reinterpret_cast<vtpl::HostLayerInfo*>(bytes)),
+        expectedStatus);
+    int32_t fields[3] = {};
+    std::memcpy(&fields[0], bytes + 0, 4);
+    std::memcpy(&fields[1], bytes + 4, 4);
+    std::memcpy(&fields[2], bytes + 112, 4);
+    return std::vector<int32_t>(fields, fields + 3);
+  };
+  EXPECT_EQ(readInfo(0), (std::vector<int32_t>{0, 1, 5}));
+  layer->info.kind = 3;
+  layer->info.frameCount = 12;
+  EXPECT_EQ(readInfo(0), (std::vector<int32_t>{3, 12, 5}));
+
+  EXPECT_EQ(host->setComparisonLayer(Image{}), nullptr);
+  EXPECT_EQ(record.getLayer(host.get(), "overlayLayer", 0, 0, identifier), nullptr);
+}
+
+TEST(Render, FailingFetchLayerHandsOutNoTexture) {
+  auto host = openHost(glSettings(false));
+  const vtpl::host::HostLayer* layer = host->setComparisonLayer(randomPicture(6, 4, 8, 19));
+  ASSERT_NE(layer, nullptr);
+  const vtpl::HostEffectRecord& record = host->record();
+  vtpl::HostTexture fetched{};
+  vtpl::HostTexture refused{};
+  refused.name = 99;
+  refused.width = 7;
+  int32_t fetchedStatus = -1;
+  int32_t refusedStatus = -1;
+  vtpl::host::GlThread other("interface");
+  other.run([&] {
+    fetchedStatus = record.fetchLayer(host.get(), nullptr, layer->identifier.c_str(), 0, &fetched);
+    record.releaseLayer(host.get(), nullptr, fetched.name);
+    host->faults().failFetchLayer = true;
+    refusedStatus = record.fetchLayer(host.get(), nullptr, layer->identifier.c_str(), 0, &refused);
+  });
+  EXPECT_EQ(fetchedStatus, 0);
+  EXPECT_NE(fetched.name, 0u);
+  EXPECT_EQ(fetched.width, 6u);
+  EXPECT_NE(refusedStatus, 0);
+  EXPECT_EQ(refused.name, 0u);
+  EXPECT_EQ(refused.width, 0u);
+  EXPECT_EQ(host->callbackCount("fetchLayer"), 2);
 }
 
 TEST(Render, ToolRendersAPictureFile) {

@@ -4,9 +4,11 @@
 
 #include <cstdio>
 #include <cstdlib>
+#include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "image.h"
@@ -204,6 +206,107 @@ TEST(Tool, DriverWithoutGlsl410FailsSetUpWithAResult) {
     EXPECT_EQ(run.out.find("error") != std::string::npos, verbose) << run.out;
   }
   std::remove(picture.c_str());
+}
+
+// A small opaque picture written to a file of the test's temporary folder.
+std::string writeTestPicture(const std::string& name, int width, int height) {
+  const std::string path = testing::TempDir() + "/" + name;
+  vtpl::host::Image image;
+  image.width = width;
+  image.height = height;
+  image.rgba.assign(4 * static_cast<size_t>(width) * height, 0.5f);
+  for (size_t i = 3; i < image.rgba.size(); i += 4) {
+    image.rgba[i] = 1.0f;
+  }
+  vtpl::host::writePng(path, image);
+  return path;
+}
+
+TEST(Tool, RenderWritesTheControlPictureAtTheAskedSize) {
+  const std::string in = writeTestPicture("tool_control_in.png", 32, 18);
+  const std::string out = in + ".out.png";
+  const std::string scope = in + ".scope.png";
+  for (const auto& [size, width, height] :
+       {std::tuple{std::string(), 500, 300}, std::tuple{std::string("64x40"), 64, 40}}) {
+    std::vector<std::string> arguments = {"render", in, "-o", out, "--control", scope};
+    if (!size.empty()) {
+      arguments.insert(arguments.end(), {"--control-size", size});
+    }
+    const ToolRun run = runTool(arguments);
+    ASSERT_EQ(run.exitCode, 0) << run.err;
+    EXPECT_EQ(run.out, "");
+    const vtpl::host::Image picture = vtpl::host::readPng(scope);
+    EXPECT_EQ(picture.width, width) << size;
+    EXPECT_EQ(picture.height, height) << size;
+    EXPECT_EQ(picture.bitDepth, 8);
+    EXPECT_EQ(vtpl::host::readPng(out).width, 32);
+    std::remove(scope.c_str());
+  }
+  const ToolRun bad =
+      runTool({"render", in, "-o", out, "--control", scope, "--control-size", "0x5"});
+  EXPECT_EQ(bad.exitCode, 2);
+  EXPECT_NE(bad.err.find("--control-size takes WIDTHxHEIGHT"), std::string::npos) << bad.err;
+  EXPECT_NE(bad.err.find("usage: vtpl-host"), std::string::npos);
+  std::remove(in.c_str());
+  std::remove(out.c_str());
+}
+
+// A comparison layer and the render-to-layer settings (a choice by text, points, a colour) are
+// taken; the output keeps the frame's size.
+TEST(Tool, RenderTakesAComparisonLayerAndRenderToLayerSettings) {
+  const std::string in = writeTestPicture("tool_layer_in.png", 48, 27);
+  const std::string other = writeTestPicture("tool_layer_b.png", 24, 14);
+  const std::string out = in + ".out.png";
+  const ToolRun run =
+      runTool({"render", in, "-o", out, "--compare", other, "--set", "blendType=Screen", "--set",
+               "scopePositionTL=0,13.5", "--set", "scopePositionBR=24,-13.5", "--set",
+               "renderToLayerBackgroundColor=0.2,0.3,0.4", "--set", "scopeComparisonType=Overlay",
+               "--trace"});
+  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_NE(run.err.find("getPoint(\"scopePositionBR\", t=0) -> (24, -13.5)"), std::string::npos);
+  EXPECT_NE(run.err.find("fetchLayer(\"c0a1b2c3-"), std::string::npos);
+  const vtpl::host::Image output = vtpl::host::readPng(out);
+  EXPECT_EQ(output.width, 48);
+  EXPECT_EQ(output.height, 27);
+  const ToolRun missing = runTool({"render", in, "-o", out, "--compare", in + ".none.png"});
+  EXPECT_EQ(missing.exitCode, 1);
+  EXPECT_NE(missing.err.find(".none.png"), std::string::npos) << missing.err;
+  for (const std::string& path : {in, other, out}) {
+    std::remove(path.c_str());
+  }
+}
+
+TEST(Tool, DemoWritesTheTestFrameTheOutputAndTheScope) {
+  const std::string folder = testing::TempDir() + "/tool_demo/nested";
+  std::filesystem::remove_all(folder);
+  const ToolRun run = runTool({"demo", "-o", folder, "--control-size", "100x60"});
+  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_EQ(run.out,
+            folder + "/test-frame.png\n" + folder + "/output.png\n" + folder + "/scope.png\n");
+  const vtpl::host::Image frame = vtpl::host::readPng(folder + "/test-frame.png");
+  // The frame the point parameters' defaults span, so that the whole frame is analysed.
+  EXPECT_EQ(frame.width, 1280);
+  EXPECT_EQ(frame.height, 720);
+  const vtpl::host::Image output = vtpl::host::readPng(folder + "/output.png");
+  EXPECT_EQ(output.width, frame.width);
+  EXPECT_EQ(output.height, frame.height);
+  // Without render to layer the frame passes through unchanged.
+  EXPECT_EQ(output.rgba, frame.rgba);
+  const vtpl::host::Image scope = vtpl::host::readPng(folder + "/scope.png");
+  EXPECT_EQ(scope.width, 100);
+  EXPECT_EQ(scope.height, 60);
+  std::filesystem::remove_all(testing::TempDir() + "/tool_demo");
+}
+
+TEST(Tool, DemoWritesIntoOutDemoOfTheCurrentFolder) {
+  const std::string folder = testing::TempDir() + "/tool_demo_default";
+  std::filesystem::remove_all(folder);
+  std::filesystem::create_directories(folder);
+  const ToolRun run = runTool({"demo", "--control-size", "20x12"}, folder);
+  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_EQ(run.out, "out/demo/test-frame.png\nout/demo/output.png\nout/demo/scope.png\n");
+  EXPECT_TRUE(std::filesystem::is_regular_file(folder + "/out/demo/scope.png"));
+  std::filesystem::remove_all(folder);
 }
 
 TEST(Tool, HelpPrintsUsage) {

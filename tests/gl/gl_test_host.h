@@ -32,8 +32,10 @@ class GlTestHost {
   uint32_t allocatedWidth = 0;
   uint32_t allocatedHeight = 0;
   std::vector<AllocationRequest> allocations;
-  // Parameter values by id for the get callbacks: a number, or a point's (x, y).
+  // Parameter values by id for the get callbacks: a number, or a point's (x, y); colours apart.
   std::map<std::string, std::array<float, 2>> parameters;
+  std::map<std::string, std::array<float, 3>> colours;
+  std::vector<uint32_t> releasedLayers;  // texture names handed back with releaseLayer
   int buffersCreated = 0;
   int buffersReleased = 0;
 
@@ -45,6 +47,10 @@ class GlTestHost {
   static void releaseBuffer(vtpl::HostContext context, uint32_t name);
   static std::array<float, 2> value(vtpl::HostContext context, const char* id);
   static int32_t getInt(vtpl::HostContext context, const char* id, int32_t);
+  static uint8_t getBool(vtpl::HostContext context, const char* id, int32_t);
+  static void getColor(vtpl::HostContext context, const char* id, int32_t, float* red, float* green,
+                       float* blue);
+  static void releaseLayer(vtpl::HostContext context, const void*, uint32_t name);
   static float getFloat(vtpl::HostContext context, const char* id, int32_t);
   static void getPoint(vtpl::HostContext context, const char* id, int32_t, float* x, float* y);
   static uint32_t allocateTexture(vtpl::HostContext context, const vtpl::HostRenderRecord*,

@@ -6,6 +6,8 @@
 #include "plugin/instance_lifecycle.h"
 #include "plugin/notify.h"
 #include "plugin/scopes_effect_data.h"
+#include "scope/blend_shader.h"
+#include "scope/graticule_drawing.h"
 #include "scope/waveform_analysis.h"
 #include "scope/waveform_display.h"
 
@@ -26,10 +28,12 @@ TEST_F(SetUp, BuildsTheProgramsOnceAndEnablesInstancedDrawing) {
   EXPECT_GE(instance.programId(Plugin::gl::kClearProgram), 0);
   EXPECT_GE(instance.programId(kCopyWaveformProgram), 0);
   EXPECT_GE(instance.programId(kFillWaveformBackgroundProgram), 0);
+  EXPECT_GE(instance.programId(kGuidelineProgram), 0);
+  EXPECT_GE(instance.programId(kBlendShaderProgram), 0);
   EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageSetUp), 1);
   EXPECT_GE(instance.programId(kWaveformProgram), 0);
   EXPECT_GE(instance.programId(kWaveformUIProgram), 0);
-  EXPECT_EQ(instance.programCount(), 6);
+  EXPECT_EQ(instance.programCount(), 8);
   EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroyInstance), 1);
 }
 

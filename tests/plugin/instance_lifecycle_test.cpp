@@ -90,4 +90,27 @@ TEST(InstanceLifecycle, ResourceLockIsRecursive) {
   EXPECT_EQ(destroyInstance(record), 1);
 }
 
+// This test program has no GL: a host that renders or draws the control without having set the
+// instance up gets "not handled" instead of a crash in an unloaded GL entry point.
+TEST(InstanceLifecycle, RenderAndControlBeforeGlIsSetUpAreNotHandled) {
+  vtpl::HostEffectRecord record{};
+  ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateSharedData), 1);
+  ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateInstance), 1);
+  vtpl::HostTexture layer{};
+  vtpl::HostRenderRecord frame{};
+  frame.source = &layer;
+  frame.destination = &layer;
+  record.messageRecord = &frame;
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageRender), 2);
+  vtpl::HostControlRecord control{};
+  control.controlId = "waveformControl";
+  control.width = 100;
+  control.height = 50;
+  record.messageRecord = &control;
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDrawControl), 2);
+  record.messageRecord = nullptr;
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroyInstance), 1);
+  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroySharedData), 1);
+}
+
 }  // namespace
