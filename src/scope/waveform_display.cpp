@@ -53,8 +53,35 @@ vec3 tintedTrace(vec3 tint, float x) {
   return toRgb * trace;
 }
 
+// The waveform under this pixel. Where the panel is smaller than the waveform along an axis, the
+// brightest of the texels the pixel covers along it: a single filtered read there would fall
+// between thin traces and show them broken or not at all.
+vec4 waveformAt(vec2 uv) {
+  vec2 size = vec2(textureSize(waveformTexture, 0));
+  vec2 footprint = fwidth(uv) * size;
+  bvec2 minified = greaterThan(footprint, vec2(1.0));
+  if (!any(minified)) {
+    return texture(waveformTexture, uv);
+  }
+  // Texels whose centres lie under the pixel, at most 16 along an axis.
+  vec2 centre = uv * size;
+  ivec2 first = ivec2(ceil(centre - 0.5 * footprint - 0.5));
+  ivec2 last = min(ivec2(floor(centre + 0.5 * footprint - 0.5)), first + 15);
+  first = ivec2(minified.x ? first.x : 0, minified.y ? first.y : 0);
+  last = ivec2(minified.x ? last.x : 0, minified.y ? last.y : 0);
+  vec4 brightest = vec4(0.0);
+  for (int j = first.y; j <= last.y; ++j) {
+    for (int i = first.x; i <= last.x; ++i) {
+      vec2 at = vec2(minified.x ? (float(i) + 0.5) / size.x : uv.x,
+                     minified.y ? (float(j) + 0.5) / size.y : uv.y);
+      brightest = max(brightest, texture(waveformTexture, at));
+    }
+  }
+  return brightest;
+}
+
 void main() {
-  vec4 w = texture(waveformTexture, texCoord);
+  vec4 w = waveformAt(texCoord);
   vec3 colour = w.rgb;
   if (displayIndex == 1) {
     colour = vec3(w.r);

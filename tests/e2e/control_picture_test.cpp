@@ -5,6 +5,7 @@
 #include <sstream>
 #include <string>
 #include <utility>
+#include <vector>
 
 #include "image.h"
 #include "test_frame.h"
@@ -45,20 +46,92 @@ TEST(ControlPicture, HasTheControlsSize) {
   host->detachControl();
 }
 
-TEST(ControlPicture, HoldsOnlyWholeEightBitCodesInRange) {
+Image greyFrame(float level, int width = 32, int height = 18) {
+  Image picture;
+  picture.width = width;
+  picture.height = height;
+  picture.rgba.assign(4u * width * height, level);
+  for (size_t i = 3; i < picture.rgba.size(); i += 4) {
+    picture.rgba[i] = 1.0f;
+  }
+  return picture;
+}
+
+// The control without graticule: only the traces over the black panel.
+std::unique_ptr<vtpl::host::EffectHost> openTracesOnlyHost() {
   auto host = openGlHost();
+  host->parameters().writeBool("showGuidelines", false);
+  host->parameters().writeBool("showStandardColorBars", false);
   host->attachControl();
-  host->renderFrame(vtpl::host::colourBarTestFrame(36, 24));
-  ASSERT_EQ(host->drawControl(sized(30, 20)), 1);
-  const Image& picture = host->controlPicture();
-  ASSERT_EQ(picture.rgba.size(), 4u * 30 * 20);
-  for (size_t i = 0; i < picture.rgba.size(); i += 4) {
-    const float alpha = picture.rgba[i + 3];
-    ASSERT_EQ(alpha * 255.0f, static_cast<float>(static_cast<int>(alpha * 255.0f + 0.5f))) << i;
-    for (int c = 0; c < 3; ++c) {
-      ASSERT_GE(picture.rgba[i + c], 0.0f) << i;
-      ASSERT_LE(picture.rgba[i + c], 1.0f) << i;
+  return host;
+}
+
+// The rows (top first) of a picture column whose `channel` is lit.
+std::vector<int> litRows(const Image& picture, int x, int channel) {
+  std::vector<int> rows;
+  for (int y = 0; y < picture.height; ++y) {
+    if (picture.pixel(x, y)[channel] > 0.2f) {
+      rows.push_back(y);
     }
+  }
+  return rows;
+}
+
+// 60 x 50 with margins of 10: the waveform panel is rows 10 to 39 from the top, and a level v
+// lands v x 30 pixels above its bottom.
+constexpr int kControlWidth = 60;
+constexpr int kControlHeight = 50;
+
+TEST(ControlPicture, GreyFrameTraceSitsAtItsLevelInsideTheBlackPanel) {
+  auto host = openTracesOnlyHost();
+  host->renderFrame(greyFrame(0.5f));
+  ASSERT_EQ(host->drawControl(sized(kControlWidth, kControlHeight)), 1);
+  const Image& picture = host->controlPicture();
+  const float background = 38.0f / 255.0f;  // the host's panel colour, 0.15
+  for (const int x : {0, 30, 59}) {
+    EXPECT_EQ(litRows(picture, x, 0), std::vector<int>{24}) << "column " << x;
+    EXPECT_NEAR(picture.pixel(x, 5)[0], background, 1e-6) << "top margin";
+    EXPECT_NEAR(picture.pixel(x, 45)[2], background, 1e-6) << "bottom margin";
+    EXPECT_EQ(picture.pixel(x, 12)[1], 0.0f) << "black panel";
+    EXPECT_EQ(picture.pixel(x, 37)[1], 0.0f) << "black panel";
+  }
+}
+
+TEST(ControlPicture, OverlayBgDrawsThePrimaryInBlueAndTheComparisonInGreen) {
+  auto host = openTracesOnlyHost();
+  host->parameters().writeInt("scopeComparisonType", 1);
+  host->parameters().writeInt("overlayChannels", 5);
+  host->setComparisonLayer(greyFrame(0.75f));
+  host->renderFrame(greyFrame(0.25f));
+  ASSERT_EQ(host->drawControl(sized(kControlWidth, kControlHeight)), 1);
+  const Image& picture = host->controlPicture();
+  // 0.25 x 30 = 7.5 and 0.75 x 30 = 22.5 pixels above the panel's bottom.
+  for (const int x : {3, 30, 56}) {
+    const std::vector<int> blue = litRows(picture, x, 2);
+    const std::vector<int> green = litRows(picture, x, 1);
+    ASSERT_FALSE(blue.empty()) << "column " << x;
+    ASSERT_FALSE(green.empty()) << "column " << x;
+    EXPECT_NEAR(blue.front(), 32, 1) << "column " << x;
+    EXPECT_NEAR(green.front(), 17, 1) << "column " << x;
+    EXPECT_TRUE(litRows(picture, x, 0).empty()) << "nothing in red, column " << x;
+    EXPECT_EQ(picture.pixel(x, green.front())[2], 0.0f) << "the comparison is green only";
+    EXPECT_EQ(picture.pixel(x, blue.front())[1], 0.0f) << "the primary is blue only";
+  }
+}
+
+TEST(ControlPicture, SideBySideShowsEachLayerInItsHalf) {
+  auto host = openTracesOnlyHost();
+  host->setComparisonLayer(greyFrame(0.75f));
+  host->renderFrame(greyFrame(0.25f));
+  ASSERT_EQ(host->drawControl(sized(kControlWidth, kControlHeight)), 1);
+  const Image& picture = host->controlPicture();
+  for (const int x : {1, 15, 28}) {
+    EXPECT_EQ(litRows(picture, x, 0).size(), 1u) << "column " << x;
+    EXPECT_NEAR(litRows(picture, x, 0).front(), 32, 1) << "column " << x;
+  }
+  for (const int x : {31, 45, 58}) {
+    EXPECT_EQ(litRows(picture, x, 0).size(), 1u) << "column " << x;
+    EXPECT_NEAR(litRows(picture, x, 0).front(), 17, 1) << "column " << x;
   }
 }
 

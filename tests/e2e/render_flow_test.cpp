@@ -146,6 +146,52 @@ TEST(RenderFlow, ComparisonLayerIsAnalysedAsTheRenderModeAsks) {
   }
 }
 
+TEST(RenderFlow, ComparisonLayersTheEffectCannotUseAreLeftOut) {
+  struct Case {
+    const char* what;
+    bool chosen;
+    uint32_t kind;
+    int32_t frameCount;
+    int32_t frameIndex;
+    bool failFetch;
+    int fetches;
+  };
+  const Case cases[] = {
+      {"usable", true, 0, 1, 0, false, 1},
+      {"usable kind 7", true, 7, 3, 2, false, 1},
+      {"none chosen", false, 0, 1, 0, false, 0},
+      {"kind 2", true, 2, 1, 0, false, 0},
+      {"kind 5", true, 5, 1, 0, false, 0},
+      {"kind 9", true, 9, 1, 0, false, 0},
+      {"frame past the end", true, 0, 2, 2, false, 0},
+      {"layer without frames", true, 0, 0, 0, false, 0},
+      {"fetch fails", true, 0, 1, 0, true, 1},
+  };
+  for (const Case& c : cases) {
+    auto host = openGlHost();
+    host->attachControl();
+    if (c.chosen) {
+      vtpl::host::HostLayer* layer = host->setComparisonLayer(greyPicture());
+      ASSERT_NE(layer, nullptr);
+      layer->info.kind = c.kind;
+      layer->info.frameCount = c.frameCount;
+    }
+    host->faults().failFetchLayer = c.failFetch;
+    FrameOptions frame;
+    frame.frameIndex = c.frameIndex;
+    // The render goes on without the comparison: the layer still reaches the output.
+    const Image output = host->renderFrame(greyPicture(), false, frame);
+    ASSERT_EQ(output.rgba.size(), greyPicture().rgba.size()) << c.what;
+    for (size_t i = 0; i < output.rgba.size(); ++i) {
+      ASSERT_NEAR(output.rgba[i], greyPicture().rgba[i], 1.0 / 255) << c.what << " value " << i;
+    }
+    const bool usable = c.fetches == 1 && !c.failFetch;
+    EXPECT_EQ(analyses(*host), usable ? 2 : 1) << c.what;
+    EXPECT_EQ(host->callbackCount("fetchLayer"), c.fetches) << c.what;
+    EXPECT_EQ(host->callbackCount("releaseLayer"), usable ? 1 : 0) << c.what;
+  }
+}
+
 TEST(RenderFlow, ControlAnalysesAStaleFrameOnlyOnce) {
   auto host = openGlHost();
   host->renderFrame(greyPicture());  // nothing attached: results marked stale

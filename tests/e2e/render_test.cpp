@@ -177,6 +177,39 @@ TEST(Render, FailingFetchLayerHandsOutNoTexture) {
   EXPECT_EQ(host->callbackCount("fetchLayer"), 2);
 }
 
+// The scope placed over the right half of the frame with an opaque background: that half shows
+// the background and the trace, the left half the layer unchanged, from exact and padded textures.
+TEST(Render, ScopeRenderedIntoTheLayerCoversOnlyItsArea) {
+  for (const bool pad : {false, true}) {
+    auto host = openHost(glSettings(pad));
+    host->setValueFromText("blendType", "Normal");
+    host->setValueFromText("renderToLayerBackgroundAlpha", "1");
+    host->setValueFromText("scopePositionTL", "0,13.5");
+    host->setValueFromText("scopePositionBR", "24,-13.5");
+    Image grey = randomPicture(48, 27, 8, 3);
+    for (size_t i = 0; i < grey.rgba.size(); ++i) {
+      grey.rgba[i] = i % 4 == 3 ? 1.0f : 100.0f / 255.0f;
+    }
+    const Image output = host->renderFrame(grey);
+    const long background = 47;  // the default background grey, 0.184
+    int backgroundPixels = 0;
+    for (int y = 0; y < 27; ++y) {
+      for (int x = 0; x < 48; ++x) {
+        const float* pixel = output.pixel(x, y);
+        if (x < 24) {
+          ASSERT_EQ(std::lround(pixel[0] * 255), 100)
+              << "pad " << pad << " pixel " << x << "," << y;
+        } else {
+          backgroundPixels += std::lround(pixel[0] * 255) == background ? 1 : 0;
+        }
+      }
+    }
+    // Every row of the right half but the trace's shows the background.
+    EXPECT_GE(backgroundPixels, 24 * 25) << "pad " << pad;
+    EXPECT_LT(backgroundPixels, 24 * 27) << "pad " << pad;
+  }
+}
+
 TEST(Render, ToolRendersAPictureFile) {
   const Image input = randomPicture(31, 17, 8, 11);
   const std::string folder = testing::TempDir();

@@ -17,30 +17,34 @@ using Pixel = std::array<float, 4>;
 
 class WaveformDisplay : public GlTest {};
 
-// Draws a one-row waveform of `stored` texels 1:1 into a float target and reads it back.
-std::vector<Pixel> display(const std::vector<Pixel>& stored, DisplayIndex index) {
-  const auto width = static_cast<GLsizei>(stored.size());
+// Draws a waveform of `stored` texels, `storedHeight` rows of equal width, into a float target of
+// its width and `shownHeight` rows, and reads it back (bottom row first).
+std::vector<Pixel> display(const std::vector<Pixel>& stored, DisplayIndex index,
+                           GLsizei storedHeight = 1, GLsizei shownHeight = 1) {
+  const auto width = static_cast<GLsizei>(stored.size()) / storedHeight;
   GLuint textures[2] = {};
   glGenTextures(2, textures);
   glBindTexture(GL_TEXTURE_2D, textures[0]);
-  glTexImage2D(GL_TEXTURE_2D, 0, GL_RGBA32F, width, 1, 0, GL_RGBA, GL_FLOAT, stored.data());
+  glTexImage2D(GL_TEXTURE_2D, 0, GL_RGBA32F, width, storedHeight, 0, GL_RGBA, GL_FLOAT,
+               stored.data());
   glBindTexture(GL_TEXTURE_2D, textures[1]);
-  glTexImage2D(GL_TEXTURE_2D, 0, GL_RGBA32F, width, 1, 0, GL_RGBA, GL_FLOAT, nullptr);
+  glTexImage2D(GL_TEXTURE_2D, 0, GL_RGBA32F, width, shownHeight, 0, GL_RGBA, GL_FLOAT, nullptr);
   const Plugin::gl::FBO framebuffer;
   glBindFramebuffer(GL_FRAMEBUFFER, framebuffer.name());
   glFramebufferTexture2D(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D, textures[1], 0);
-  glViewport(0, 0, width, 1);
+  glViewport(0, 0, width, shownHeight);
 
   GlTestHost host;
   Plugin::gl::EffectData programs;
   ensureWaveformDisplayPrograms(programs, false);
   const float w = static_cast<float>(width);
-  const Plugin::gl::Matrix4 projection = Plugin::gl::orthographicMatrix(w, 1);
-  drawWaveformDisplay(host.calls(), programs, textures[0], {0, 0, w, 1}, index, projection,
+  const float h = static_cast<float>(shownHeight);
+  const Plugin::gl::Matrix4 projection = Plugin::gl::orthographicMatrix(w, h);
+  drawWaveformDisplay(host.calls(), programs, textures[0], {0, 0, w, h}, index, projection,
                       Plugin::gl::kIdentityMatrix);
 
-  std::vector<Pixel> shown(stored.size());
-  glReadPixels(0, 0, width, 1, GL_RGBA, GL_FLOAT, shown.data());
+  std::vector<Pixel> shown(static_cast<size_t>(width) * shownHeight);
+  glReadPixels(0, 0, width, shownHeight, GL_RGBA, GL_FLOAT, shown.data());
   glBindFramebuffer(GL_FRAMEBUFFER, 0);
   glDeleteTextures(2, textures);
   return shown;
@@ -108,6 +112,24 @@ TEST_F(WaveformDisplay, TintedTracesFadeToGreyAndSaturateToWhite) {
     }
     EXPECT_NEAR(shown[1][3], std::max(shown[1][0], std::max(shown[1][1], shown[1][2])), 1e-6)
         << where;
+  }
+}
+
+TEST_F(WaveformDisplay, ThinTracesSurviveAPanelSmallerThanTheWaveform) {
+  // 64 rows shown in 8: one lit row in each column, each in a different place within the eight
+  // rows that share a pixel. Every trace keeps its full brightness in the pixel that covers it.
+  const std::vector<GLsizei> litRows = {37, 40, 47, 0};
+  std::vector<Pixel> stored(4 * 64, Pixel{});
+  for (size_t column = 0; column < litRows.size(); ++column) {
+    stored[static_cast<size_t>(litRows[column]) * 4 + column] = {0.6f, 0.6f, 0.6f, 1};
+  }
+  const std::vector<Pixel> shown = display(stored, kDisplayAsStored, 64, 8);
+  for (size_t column = 0; column < litRows.size(); ++column) {
+    for (GLsizei row = 0; row < 8; ++row) {
+      const float expected = row == litRows[column] / 8 ? 0.6f : 0.0f;
+      EXPECT_NEAR(shown[static_cast<size_t>(row) * 4 + column][0], expected, 1e-6)
+          << "column " << column << " row " << row;
+    }
   }
 }
 
