@@ -39,6 +39,7 @@ struct Case {
   const char* name;
   std::vector<std::pair<std::string, std::string>> settings;  // as --set would give them
   bool comparison;
+  bool attached = true;  // false: no control open, so the render only copies the layer
 };
 
 struct Timing {
@@ -71,7 +72,9 @@ Timing timeCase(const PluginModule& module, const Case& c, const Image& frame,
   if (c.comparison) {
     host.setComparisonLayer(comparison);
   }
-  host.attachControl();
+  if (c.attached) {
+    host.attachControl();
+  }
   ControlOptions control;
   control.width = kControlWidth;
   control.height = kControlHeight;
@@ -90,7 +93,9 @@ Timing timeCase(const PluginModule& module, const Case& c, const Image& frame,
     controls.push_back(drawing);
     together.push_back(render + drawing);
   }
-  host.detachControl();
+  if (c.attached) {
+    host.detachControl();
+  }
   return {median(renders), median(controls), median(together)};
 }
 
@@ -136,18 +141,25 @@ int main(int argc, char** argv) {
     const PluginModule module(options.plugin);
     const Image frame = colourBarTestFrame(kFrameWidth, kFrameHeight);
     const Image comparison = mirrored(frame);
-    // Render to layer over the lower-right quarter of the frame (frame pixels from the centre,
-    // y up).
+    // The point parameters' defaults span 1280 x 720: every case analyses the whole HD frame,
+    // and the scope rendered into the layer covers all of it (frame pixels from the centre, y up).
+    const std::vector<std::pair<std::string, std::string>> wholeFrame = {
+        {"clipStartPos", "-960,-540"}, {"clipEndPos", "960,540"}};
+    const auto with = [&wholeFrame](std::vector<std::pair<std::string, std::string>> settings) {
+      settings.insert(settings.begin(), wholeFrame.begin(), wholeFrame.end());
+      return settings;
+    };
     const std::vector<Case> cases = {
-        {"Luminance", {{"waveformMode", "Luminance"}}, false},
-        {"Luminance + comparison", {{"waveformMode", "Luminance"}}, true},
-        {"RGB", {{"waveformMode", "RGB"}}, false},
-        {"RGB + comparison", {{"waveformMode", "RGB"}}, true},
+        {"Nothing attached (copy only)", with({}), false, false},
+        {"Luminance", with({{"waveformMode", "Luminance"}}), false},
+        {"Luminance + comparison", with({{"waveformMode", "Luminance"}}), true},
+        {"RGB", with({{"waveformMode", "RGB"}}), false},
+        {"RGB + comparison", with({{"waveformMode", "RGB"}}), true},
         {"Luminance, Screen to layer",
-         {{"waveformMode", "Luminance"},
-          {"blendType", "Screen"},
-          {"scopePositionTL", "0,0"},
-          {"scopePositionBR", "960,-540"}},
+         with({{"waveformMode", "Luminance"},
+               {"blendType", "Screen"},
+               {"scopePositionTL", "-960,540"},
+               {"scopePositionBR", "960,-540"}}),
          false},
     };
     std::printf("GL: %s\n", rendererName().c_str());
