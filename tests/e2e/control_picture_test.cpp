@@ -57,12 +57,15 @@ Image greyFrame(float level, int width = 32, int height = 18) {
   return picture;
 }
 
-// The control without graticule: only the traces over the black panel.
-std::unique_ptr<vtpl::host::EffectHost> openTracesOnlyHost() {
+// The control without graticule: only the traces over the black panel. Attached, the render
+// analyses the frame; otherwise the control analyses it on the interface thread before drawing.
+std::unique_ptr<vtpl::host::EffectHost> openTracesOnlyHost(bool attached = true) {
   auto host = openGlHost();
   host->parameters().writeBool("showGuidelines", false);
   host->parameters().writeBool("showStandardColorBars", false);
-  host->attachControl();
+  if (attached) {
+    host->attachControl();
+  }
   return host;
 }
 
@@ -83,17 +86,22 @@ constexpr int kControlWidth = 60;
 constexpr int kControlHeight = 50;
 
 TEST(ControlPicture, GreyFrameTraceSitsAtItsLevelInsideTheBlackPanel) {
-  auto host = openTracesOnlyHost();
-  host->renderFrame(greyFrame(0.5f));
-  ASSERT_EQ(host->drawControl(sized(kControlWidth, kControlHeight)), 1);
-  const Image& picture = host->controlPicture();
-  const float background = 38.0f / 255.0f;  // the host's panel colour, 0.15
-  for (const int x : {0, 30, 59}) {
-    EXPECT_EQ(litRows(picture, x, 0), std::vector<int>{24}) << "column " << x;
-    EXPECT_NEAR(picture.pixel(x, 5)[0], background, 1e-6) << "top margin";
-    EXPECT_NEAR(picture.pixel(x, 45)[2], background, 1e-6) << "bottom margin";
-    EXPECT_EQ(picture.pixel(x, 12)[1], 0.0f) << "black panel";
-    EXPECT_EQ(picture.pixel(x, 37)[1], 0.0f) << "black panel";
+  for (const bool attached : {true, false}) {
+    auto host = openTracesOnlyHost(attached);
+    host->renderFrame(greyFrame(0.5f));
+    ASSERT_EQ(host->drawControl(sized(kControlWidth, kControlHeight)), 1);
+    EXPECT_EQ(host->callbackCount("fetchOwnLayer"), attached ? 0 : 1);
+    const Image& picture = host->controlPicture();
+    const float background = 38.0f / 255.0f;  // the host's panel colour, 0.15
+    for (const int x : {0, 30, 59}) {
+      const std::string where =
+          "attached " + std::to_string(attached) + " column " + std::to_string(x);
+      EXPECT_EQ(litRows(picture, x, 0), std::vector<int>{24}) << where;
+      EXPECT_NEAR(picture.pixel(x, 5)[0], background, 1e-6) << where << " top margin";
+      EXPECT_NEAR(picture.pixel(x, 45)[2], background, 1e-6) << where << " bottom margin";
+      EXPECT_EQ(picture.pixel(x, 12)[1], 0.0f) << where << " black panel";
+      EXPECT_EQ(picture.pixel(x, 37)[1], 0.0f) << where << " black panel";
+    }
   }
 }
 
