@@ -150,33 +150,6 @@ TEST(Render, ComparisonLayerInformationIsWhatTheHostHolds) {
   EXPECT_EQ(record.getLayer(host.get(), "overlayLayer", 0, 0, identifier), nullptr);
 }
 
-TEST(Render, FailingFetchLayerHandsOutNoTexture) {
-  auto host = openHost(glSettings(false));
-  const vtpl::host::HostLayer* layer = host->setComparisonLayer(randomPicture(6, 4, 8, 19));
-  ASSERT_NE(layer, nullptr);
-  const vtpl::HostEffectRecord& record = host->record();
-  vtpl::HostTexture fetched{};
-  vtpl::HostTexture refused{};
-  refused.name = 99;
-  refused.width = 7;
-  int32_t fetchedStatus = -1;
-  int32_t refusedStatus = -1;
-  vtpl::host::GlThread other("interface");
-  other.run([&] {
-    fetchedStatus = record.fetchLayer(host.get(), nullptr, layer->identifier.c_str(), 0, &fetched);
-    record.releaseLayer(host.get(), nullptr, fetched.name);
-    host->faults().failFetchLayer = true;
-    refusedStatus = record.fetchLayer(host.get(), nullptr, layer->identifier.c_str(), 0, &refused);
-  });
-  EXPECT_EQ(fetchedStatus, 0);
-  EXPECT_NE(fetched.name, 0u);
-  EXPECT_EQ(fetched.width, 6u);
-  EXPECT_NE(refusedStatus, 0);
-  EXPECT_EQ(refused.name, 0u);
-  EXPECT_EQ(refused.width, 0u);
-  EXPECT_EQ(host->callbackCount("fetchLayer"), 2);
-}
-
 // The scope placed over the right half of the frame with an opaque background: that half shows
 // the background and the trace, the left half the layer unchanged, from exact and padded textures.
 TEST(Render, ScopeRenderedIntoTheLayerCoversOnlyItsArea) {
