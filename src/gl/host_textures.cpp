@@ -95,22 +95,14 @@ Matrix4 orthographicMatrix(float width, float height) {
 Matrix4 orthographicMatrix(float left, float right, float bottom, float top) {
   const float width = right - left;
   const float height = top - bottom;
-  return {2.0f / width,
-          0,
-          0,
-          0,
-          0,
-          2.0f / height,
-          0,
-          0,
-          0,
-          0,
-          -1,
-          0,
-          -(right + left) / width,
-          -(top + bottom) / height,
-          0,
-          1};
+  Matrix4 projection{};  // column-major
+  projection[0] = 2.0f / width;
+  projection[5] = 2.0f / height;
+  projection[10] = -1.0f;
+  projection[12] = -(right + left) / width;
+  projection[13] = -(top + bottom) / height;
+  projection[15] = 1.0f;
+  return projection;
 }
 
 vtpl::HostTexture acquireWorkingTexture(const HostCalls& host, GLuint width, GLuint height,
