@@ -5,12 +5,13 @@
 #                   --folder DIR)
 #   scope_bench     whole HD frames through the reference host: render, scope control drawing,
 #                   both, for each mode and layout (--runs N)
-#   scripts/bench.sh [--only analysis|scope] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]
+#   font_cache_bench  the font catalogue's first load and its lookups (--runs N)
+#   scripts/bench.sh [--only analysis|scope|fonts] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 
 usage() {
-  echo "usage: scripts/bench.sh [--only analysis|scope] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
+  echo "usage: scripts/bench.sh [--only analysis|scope|fonts] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
   exit 2
 }
 
@@ -44,17 +45,21 @@ while (($# > 0)); do
       ;;
   esac
 done
-if [[ -n "$only" && "$only" != analysis && "$only" != scope ]]; then
-  echo "bench: --only takes analysis or scope, not '$only'" >&2
+if [[ -n "$only" && "$only" != analysis && "$only" != scope && "$only" != fonts ]]; then
+  echo "bench: --only takes analysis, scope or fonts, not '$only'" >&2
   usage
 fi
 
 "$root/scripts/setup.sh" --bench
 "$root/scripts/build.sh" >/dev/null
-if [[ "$only" != scope ]]; then
+if [[ -z "$only" || "$only" == analysis ]]; then
   "$root/build/bench/analysis_bench" "${analysis_arguments[@]}"
+  [[ -n "$only" ]] || echo
 fi
-if [[ "$only" != analysis ]]; then
-  [[ "$only" == scope ]] || echo
+if [[ -z "$only" || "$only" == scope ]]; then
   "$root/build/bench/scope_bench" "${scope_arguments[@]}"
+  [[ -n "$only" ]] || echo
+fi
+if [[ -z "$only" || "$only" == fonts ]]; then
+  "$root/build/bench/font_cache_bench" "${scope_arguments[@]}"
 fi

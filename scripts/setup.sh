@@ -4,17 +4,20 @@
 set -euo pipefail
 #   scripts/setup.sh          what building and testing need
 #   scripts/setup.sh --bench  also what the benchmarks compare against
+#   scripts/setup.sh --fuzz   also the compiler and runtime of the fuzz targets
 
 packages=(
   build-essential cmake ninja-build pkg-config binutils clang-format
   libglew-dev libegl-dev libgl-dev libegl-mesa0 libgl1-mesa-dri
   libfreetype-dev libharfbuzz-dev zlib1g-dev libfontconfig-dev fontconfig fonts-dejavu-core
+  fonts-inter-variable fonts-wqy-microhei
   libpng-dev unicode-data
   libgtest-dev libgmock-dev libbenchmark-dev
 )
-if [[ "${1:-}" == "--bench" ]]; then
-  packages+=(ffmpeg)
-fi
+case "${1:-}" in
+  --bench) packages+=(ffmpeg) ;;
+  --fuzz) packages+=(clang libclang-rt-14-dev) ;;
+esac
 
 missing=()
 for package in "${packages[@]}"; do

@@ -30,15 +30,16 @@ std::string shellQuoted(const std::string& text) {
   return quoted + "'";
 }
 
-// Runs the tool from `folder` when one is given, with `environment` ("NAME=value ...") added.
+// Runs the tool (vtpl-host unless another is named) from `folder` when one is given, with
+// `environment` ("NAME=value ...") added.
 ToolRun runTool(const std::vector<std::string>& arguments, const std::string& folder = "",
-                const std::string& environment = "") {
+                const std::string& environment = "", const char* tool = VTPL_HOST_TOOL_PATH) {
   char errPath[] = "/tmp/vtpl-host-test-XXXXXX";
   const int errFile = mkstemp(errPath);
   EXPECT_GE(errFile, 0);
   std::string command = folder.empty() ? "" : "cd " + shellQuoted(folder) + " && ";
   command += environment.empty() ? "" : "env " + environment + " ";
-  command += shellQuoted(VTPL_HOST_TOOL_PATH);
+  command += shellQuoted(tool);
   for (const std::string& argument : arguments) {
     command += " " + shellQuoted(argument);
   }
@@ -307,6 +308,41 @@ TEST(Tool, DemoWritesIntoOutDemoOfTheCurrentFolder) {
   EXPECT_EQ(run.out, "out/demo/test-frame.png\nout/demo/output.png\nout/demo/scope.png\n");
   EXPECT_TRUE(std::filesystem::is_regular_file(folder + "/out/demo/scope.png"));
   std::filesystem::remove_all(folder);
+}
+
+// vtpl-fonts prints the effect's font catalogue of this machine (fonts-dejavu-core installed).
+TEST(Tool, FontsListsTheCatalogueAndFindsNames) {
+  const auto fonts = [](const std::vector<std::string>& arguments) {
+    return runTool(arguments, "", "", VTPL_FONTS_TOOL_PATH);
+  };
+  const ToolRun all = fonts({});
+  ASSERT_EQ(all.exitCode, 0) << all.err;
+  EXPECT_EQ(all.out.rfind("Fonts folder: /", 0), 0u) << all.out;
+  EXPECT_NE(all.out.find("\nDejaVuSans | DejaVu Sans | DejaVu Sans | Book | "
+                         "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf | 0 | 0 | "),
+            std::string::npos)
+      << all.out;
+
+  const ToolRun family = fonts({"--family", "DejaVu Sans Mono"});
+  ASSERT_EQ(family.exitCode, 0) << family.err;
+  std::istringstream lines(family.out);
+  int faces = 0;
+  for (std::string line; std::getline(lines, line);) {
+    if (line.find(".ttf | ") != std::string::npos) {
+      EXPECT_NE(line.find(" | DejaVu Sans Mono | "), std::string::npos) << line;
+      ++faces;
+    }
+  }
+  EXPECT_GE(faces, 2);
+
+  const ToolRun found = fonts({"--find", "DejaVu Sans Bold"});
+  EXPECT_EQ(found.exitCode, 0) << found.err;
+  EXPECT_NE(found.out.find("\nDejaVuSans-Bold | DejaVu Sans Bold | "), std::string::npos)
+      << found.out;
+  const ToolRun missing = fonts({"--find", "No Such Font Anywhere"});
+  EXPECT_EQ(missing.exitCode, 1);
+  EXPECT_NE(missing.out.find("not installed"), std::string::npos) << missing.out;
+  EXPECT_EQ(fonts({"--size"}).exitCode, 2);
 }
 
 TEST(Tool, HelpPrintsUsage) {

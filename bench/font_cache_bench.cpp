@@ -1,0 +1,75 @@
+// Times the font catalogue on this machine: the first load (installed-font lists, the two
+// enumeration passes and reading every font file), and lookups answered from the memo and not.
+//   font_cache_bench [--runs N]
+#include <algorithm>
+#include <chrono>
+#include <cstdio>
+#include <cstdlib>
+#include <string>
+#include <vector>
+
+#include "fonts/font_cache.h"
+
+namespace {
+
+using Clock = std::chrono::steady_clock;
+using vesk::project::FontCache;
+
+double millisecondsSince(Clock::time_point start) {
+  return std::chrono::duration<double, std::milli>(Clock::now() - start).count();
+}
+
+double median(std::vector<double> values) {
+  std::sort(values.begin(), values.end());
+  return values[values.size() / 2];
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  int runs = 3;
+  for (int i = 1; i < argc; ++i) {
+    if (std::string(argv[i]) == "--runs" && i + 1 < argc) {
+      runs = std::max(1, std::atoi(argv[++i]));
+    } else {
+      std::fprintf(stderr, "usage: font_cache_bench [--runs N]\n");
+      return 2;
+    }
+  }
+  std::vector<double> loads;
+  size_t faces = 0;
+  for (int run = 0; run < runs; ++run) {
+    // A fresh catalogue each run: the load is what the first label of a session pays.
+    FontCache cache(platform::systemServices());
+    const Clock::time_point start = Clock::now();
+    faces = cache.records().size();
+    loads.push_back(millisecondsSince(start));
+  }
+  FontCache cache(platform::systemServices());
+  const std::vector<vesk::project::FontRecord> records = cache.records();
+  if (records.size() < 2) {
+    std::fprintf(stderr, "font_cache_bench: fewer than two fonts installed\n");
+    return 1;
+  }
+  const std::u16string first = records.front().postScriptName;
+  const std::u16string last = records.back().postScriptName;
+  constexpr int kLookups = 200000;
+  const auto timeLookups = [&](bool alternate) {
+    const Clock::time_point start = Clock::now();
+    size_t found = 0;
+    for (int i = 0; i < kLookups; ++i) {
+      const std::u16string& name = alternate && i % 2 == 1 ? last : first;
+      found += cache.findFont(name, u"", name).faceIndex >= 0 ? 1 : 0;
+    }
+    const double microseconds = millisecondsSince(start) * 1000.0 / kLookups;
+    return found == static_cast<size_t>(kLookups) ? microseconds : -1.0;
+  };
+  const double memoised = timeLookups(false);
+  const double unmemoised = timeLookups(true);
+  std::printf("font catalogue on this machine: %zu faces in %zu families\n", faces,
+              cache.familyNames().size());
+  std::printf("first load                        %10.1f ms (median of %d)\n", median(loads), runs);
+  std::printf("findFont, same names (memo)       %10.3f us per lookup\n", memoised);
+  std::printf("findFont, alternating (no memo)   %10.3f us per lookup\n", unmemoised);
+  return 0;
+}

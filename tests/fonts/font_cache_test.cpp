@@ -1,0 +1,372 @@
+// The font catalogue on a fake system (installed-font lists, enumerated faces and font files the
+// tests write) and on this machine.
+#include "fonts/font_cache.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "sfnt_writer.h"
+
+namespace waveform_test {
+namespace {
+
+using platform::EnumeratedFace;
+using platform::FontHive;
+using platform::InstalledFont;
+using vesk::project::FontCache;
+using vesk::project::FontRecord;
+
+std::u16string utf16(const std::string& ascii) {
+  return std::u16string(ascii.begin(), ascii.end());
+}
+
+std::string ascii(const std::u16string& text) {
+  return std::string(text.begin(), text.end());
+}
+
+// A system whose fonts the test chooses.
+class FakeSystem : public platform::SystemServices {
+ public:
+  std::optional<std::u16string> folder;
+  std::map<FontHive, std::optional<std::vector<InstalledFont>>> lists;
+  std::vector<EnumeratedFace> faces;
+
+  std::optional<std::u16string> fontsFolder() const override { return folder; }
+  std::optional<std::vector<InstalledFont>> installedFonts(FontHive hive) const override {
+    const auto found = lists.find(hive);
+    return found != lists.end() ? found->second : std::vector<InstalledFont>{};
+  }
+  std::vector<EnumeratedFace> enumerateFamilies() const override {
+    std::vector<EnumeratedFace> families;
+    for (const EnumeratedFace& face : faces) {
+      bool known = false;
+      for (const EnumeratedFace& family : families) {
+        known = known || family.faceName == face.faceName;
+      }
+      if (!known) {
+        families.push_back(face);
+      }
+    }
+    return families;
+  }
+  std::vector<EnumeratedFace> enumerateFaces(const std::u16string& faceName) const override {
+    std::vector<EnumeratedFace> found;
+    for (const EnumeratedFace& face : faces) {
+      if (face.faceName.substr(0, 31) == faceName) {
+        found.push_back(face);
+      }
+    }
+    return found;
+  }
+  std::vector<uint8_t> fontData(const std::u16string&, bool, bool) const override { return {}; }
+  uint16_t userLanguageId() const override { return 0x0409; }
+  std::u16string moduleFolder() const override { return u"/"; }
+  std::array<uint8_t, 16> newGuid() const override { return {}; }
+  bool isWideSpace(char32_t) const override { return false; }
+};
+
+// A fake system with its fonts folder in a fresh temporary folder.
+class FontCacheOnFakeSystem : public testing::Test {
+ protected:
+  void SetUp() override {
+    root_ = std::filesystem::path(testing::TempDir()) /
+            ("font_cache_" +
+             std::string(testing::UnitTest::GetInstance()->current_test_info()->name()));
+    std::filesystem::remove_all(root_);
+    std::filesystem::create_directories(root_ / "fonts");
+    system_ = std::make_shared<FakeSystem>();
+    system_->folder = utf16((root_ / "fonts").string() + "/");
+  }
+  void TearDown() override { std::filesystem::remove_all(root_); }
+
+  // Writes a font with these Windows English names under the root (a path relative to it).
+  std::u16string writeFont(const std::string& relativePath, const std::u16string& family,
+                           const std::u16string& style, const std::u16string& fullName,
+                           const std::u16string& postScriptName) {
+    return writeBytes(relativePath, namedFont(family, style, fullName, postScriptName).build());
+  }
+  std::u16string writeBytes(const std::string& relativePath, const std::vector<uint8_t>& bytes) {
+    const std::filesystem::path path = root_ / relativePath;
+    std::filesystem::create_directories(path.parent_path());
+    std::ofstream(path, std::ios::binary)
+        .write(reinterpret_cast<const char*>(bytes.data()),
+               static_cast<std::streamsize>(bytes.size()));
+    return utf16(path.string());
+  }
+  void install(FontHive hive, const std::u16string& name, const std::u16string& file) {
+    auto& list = system_->lists[hive];
+    if (!list) {
+      list.emplace();
+    }
+    list->push_back({name, file});
+  }
+  void enumerate(const std::u16string& family, const std::u16string& style,
+                 const std::u16string& fullName, int32_t type = platform::kTrueTypeFontType) {
+    system_->faces.push_back({family, style, fullName, type});
+  }
+  // A family of faces, each in its own file in the fonts folder, installed and enumerated.
+  void addFamily(const std::u16string& family, const std::vector<std::u16string>& styles) {
+    for (const std::u16string& style : styles) {
+      const std::u16string postScript = family + u"-" + style;
+      const std::u16string full = family + u" " + style;
+      const std::string file = ascii(postScript) + ".ttf";
+      writeFont("fonts/" + file, family, style, full, postScript);
+      install(FontHive::kMachine, full + u" (TrueType)", utf16(file));
+      enumerate(family, style, full);
+    }
+  }
+  std::u16string fontsFolder() const { return *system_->folder; }
+
+  std::filesystem::path root_;
+  std::shared_ptr<FakeSystem> system_;
+};
+
+TEST(FontCacheNames, DisplayNamesBecomeLowerCaseKeysWithoutTheFormat) {
+  using vesk::project::displayNameKey;
+  EXPECT_EQ(displayNameKey(u"Foo Bold (TrueType)"), u"foo bold");
+  EXPECT_EQ(displayNameKey(u"Bar Sans (OpenType)"), u"bar sans");
+  EXPECT_EQ(displayNameKey(u"A (TrueType) & B (TrueType)"), u"a & b");
+  EXPECT_EQ(displayNameKey(u"Plain"), u"plain");
+}
+
+TEST(FontCacheNames, FileNamesResolveAgainstTheFontsFolder) {
+  using vesk::project::resolveFontFile;
+  const std::u16string folder = u"/fonts/";
+  const std::pair<std::u16string, std::u16string> cases[] = {
+      {u"arial.ttf", u"/fonts/arial.ttf"},
+      {u"c:\\fonts\\x.ttf", u"/fonts/c:\\fonts\\x.ttf"},  // a lower-case drive is relative
+      {u"C:\\Fonts\\x.ttf", u"C:\\Fonts\\x.ttf"},
+      {u"D:/x.ttf", u"/fonts/D:/x.ttf"},
+      {u"C:\\", u"/fonts/C:\\"},  // too short to be a drive path
+      {u"/usr/share/fonts/x.ttf", u"/usr/share/fonts/x.ttf"},
+      {u"sub/dir/y.otf", u"/fonts/sub/dir/y.otf"},
+  };
+  for (const auto& [file, path] : cases) {
+    EXPECT_EQ(resolveFontFile(folder, file), path) << ascii(file);
+  }
+}
+
+TEST_F(FontCacheOnFakeSystem, FileThatCannotBeReadIsKnownByItsDisplayName) {
+  writeBytes("fonts/foo.ttf", {'n', 'o', 't', ' ', 'a', ' ', 'f', 'o', 'n', 't'});
+  install(FontHive::kMachine, u"Foo Bold (TrueType)", u"foo.ttf");
+  enumerate(u"Foo", u"Bold", u"foo bold");
+  FontCache cache(system_);
+  const FontRecord record = cache.findFont(u"foo bold", u"", u"");
+  EXPECT_EQ(record.filePath, fontsFolder() + u"foo.ttf");
+  // Nothing could be read from the file: the enumeration's names stay.
+  EXPECT_EQ(record.familyName, u"Foo");
+  EXPECT_EQ(record.styleName, u"Bold");
+  EXPECT_EQ(record.postScriptName, u"foo bold");
+  EXPECT_EQ(record.gdiFullName, u"foo bold");
+}
+
+TEST_F(FontCacheOnFakeSystem, NamesComeFromTheFileAndPathsResolve) {
+  writeFont("fonts/rel.ttf", u"Rel Sans", u"Bold", u"Rel Sans Bold", u"RelSans-Bold");
+  const std::u16string outside =
+      writeFont("elsewhere/abs.ttf", u"Abs Serif", u"Regular", u"Abs Serif", u"AbsSerif");
+  install(FontHive::kMachine, u"Rel Sans Bold (TrueType)", u"rel.ttf");
+  install(FontHive::kMachine, u"Abs Serif (TrueType)", outside);
+  // The enumeration knows the faces by other names; the files' names win.
+  enumerate(u"RelSans", u"Bold", u"Rel Sans Bold");
+  enumerate(u"AbsSerif", u"Normal", u"Abs Serif");
+  enumerate(u"Unfiled", u"Regular", u"Unfiled Regular");
+  FontCache cache(system_);
+
+  const FontRecord rel = cache.findFont(u"RelSans-Bold", u"", u"");
+  EXPECT_EQ(rel.filePath, fontsFolder() + u"rel.ttf");
+  EXPECT_EQ(rel.familyName, u"Rel Sans");
+  EXPECT_EQ(rel.gdiFamilyName, u"RelSans");
+  EXPECT_EQ(rel.styleName, u"Bold");
+  EXPECT_EQ(rel.fullName, u"Rel Sans Bold");
+  EXPECT_GT(rel.strikeoutSize, 0.0f);
+  const FontRecord abs = cache.findFont(u"", u"", u"Abs Serif");
+  EXPECT_EQ(abs.filePath, outside);
+  EXPECT_EQ(abs.postScriptName, u"AbsSerif");
+  EXPECT_EQ(abs.styleName, u"Regular");
+  // A face no list names keeps the enumeration's names, no file and no metrics.
+  const FontRecord unfiled = cache.findFont(u"Unfiled Regular", u"", u"");
+  EXPECT_EQ(unfiled.postScriptName, u"Unfiled Regular");
+  EXPECT_TRUE(unfiled.filePath.empty());
+  EXPECT_EQ(unfiled.strikeoutSize, 0.0f);
+  EXPECT_FALSE(unfiled.embeddable);
+  EXPECT_EQ(cache.familyNames(), (std::set<std::u16string>{u"Abs Serif", u"Rel Sans", u"Unfiled"}));
+}
+
+TEST_F(FontCacheOnFakeSystem, NamedInstancesOfAVariableFontAreFacesOfTheirOwn) {
+  SfntFont font = namedFont(u"Var Sans", u"Regular", u"Var Sans Regular", u"VarSans-Regular");
+  font.addName(3, 1033, 257, u"Light").addName(3, 1033, 258, u"Bold");
+  font.addName(3, 1033, 259, u"VarSans-BoldInstance");
+  FvarTable fvar;
+  fvar.axes.push_back({});
+  fvar.instances = {{257, 0, {300}}, {258, 259, {700}}};
+  fvar.postScriptNameIDs = true;
+  font.setFvar(fvar);
+  writeBytes("fonts/var.ttf", font.build());
+  install(FontHive::kMachine, u"Var Sans (TrueType)", u"var.ttf");
+  enumerate(u"Var Sans", u"Regular", u"Var Sans Regular");
+  enumerate(u"Var Sans", u"Light", u"Var Sans Regular Light");
+  enumerate(u"Var Sans", u"Bold", u"VarSans-BoldInstance");
+  FontCache cache(system_);
+
+  const FontRecord plain = cache.findFont(u"VarSans-Regular", u"", u"");
+  EXPECT_EQ(plain.instanceId, 0);
+  EXPECT_EQ(plain.styleName, u"Regular");
+  // An instance without a PostScript name of its own is known by its full name.
+  const FontRecord light = cache.findFont(u"Var Sans Regular Light", u"", u"");
+  EXPECT_EQ(light.instanceId, 257);
+  EXPECT_EQ(light.styleName, u"Light");
+  EXPECT_EQ(light.fullName, u"Var Sans Regular Light");
+  EXPECT_EQ(light.postScriptName, u"Var Sans Regular Light");
+  const FontRecord bold = cache.findFont(u"VarSans-BoldInstance", u"", u"");
+  EXPECT_EQ(bold.instanceId, 258);
+  EXPECT_EQ(bold.styleName, u"Bold");
+  EXPECT_EQ(bold.fullName, u"Var Sans Regular Bold");
+  EXPECT_EQ(bold.filePath, fontsFolder() + u"var.ttf");
+  EXPECT_EQ(cache.records().size(), 3u);
+  // The family names its plain regular face.
+  EXPECT_EQ(cache.findFont(u"x", u"Var Sans", u"y").postScriptName, u"VarSans-Regular");
+}
+
+TEST_F(FontCacheOnFakeSystem, UserFontReplacesAMachineFontOfTheSameName) {
+  writeFont("fonts/shared.ttf", u"Shared", u"Regular", u"Shared Regular", u"Shared-Regular");
+  const std::u16string mine = writeFont("home/fonts/shared.ttf", u"Shared", u"Regular",
+                                        u"Shared Regular", u"Shared-Regular");
+  install(FontHive::kMachine, u"Shared Regular (TrueType)", u"shared.ttf");
+  install(FontHive::kUser, u"Shared Regular (TrueType)", mine);
+  enumerate(u"Shared", u"Regular", u"Shared Regular");
+  FontCache cache(system_);
+  EXPECT_EQ(cache.findFont(u"Shared-Regular", u"", u"").filePath, mine);
+}
+
+TEST_F(FontCacheOnFakeSystem, FamiliesNameTheirRegularFaceElseTheirFirst) {
+  addFamily(u"Fam", {u"Bold", u"Regular", u"Italic"});
+  addFamily(u"Other", {u"Bold", u"Black"});
+  FontCache cache(system_);
+  EXPECT_EQ(cache.findFont(u"", u"Fam", u"nothing").postScriptName, u"Fam-Regular");
+  EXPECT_EQ(cache.findFont(u"", u"Other", u"nothing else").postScriptName, u"Other-Black");
+  EXPECT_TRUE(cache.hasFont(u"", u"Other", u"nothing"));
+  EXPECT_FALSE(cache.hasFont(u"nothing", u"No Such Family", u"nothing"));
+}
+
+TEST_F(FontCacheOnFakeSystem, LookupsTryPostScriptThenFullNamesThenFamily) {
+  addFamily(u"Fam", {u"Bold", u"Regular"});
+  FontCache cache(system_);
+  struct Case {
+    std::u16string postScript, family, full, expected;
+  };
+  const Case cases[] = {
+      {u"Fam-Bold", u"Fam", u"Fam Regular", u"Fam-Bold"},  // PostScript name first
+      {u"Fam Bold", u"", u"", u"Fam-Bold"},                // a full name given as PostScript
+      {u"", u"", u"Fam Bold", u"Fam-Bold"},                // the full name alone
+      {u"x", u"", u"Fam Bold", u"Fam-Bold"},
+      {u"x", u"Fam", u"y", u"Fam-Regular"},  // only the family matches
+  };
+  for (const Case& c : cases) {
+    EXPECT_EQ(cache.findFont(c.postScript, c.family, c.full).postScriptName, c.expected)
+        << ascii(c.postScript) << " / " << ascii(c.family) << " / " << ascii(c.full);
+  }
+}
+
+TEST_F(FontCacheOnFakeSystem, TheMemoLooksAtTheNamesNotTheFamily) {
+  addFamily(u"Fam", {u"Regular"});
+  addFamily(u"Other", {u"Bold"});
+  FontCache cache(system_);
+  EXPECT_EQ(cache.findFont(u"none", u"Fam", u"none").postScriptName, u"Fam-Regular");
+  // The same two names with another family: the remembered record.
+  EXPECT_EQ(cache.findFont(u"none", u"Other", u"none").postScriptName, u"Fam-Regular");
+  EXPECT_EQ(cache.findFont(u"none", u"Other", u"none2").postScriptName, u"Other-Bold");
+  // hasFont does not use the memo.
+  EXPECT_TRUE(cache.hasFont(u"none", u"Other", u"none2"));
+}
+
+TEST_F(FontCacheOnFakeSystem, DefaultIsRegularArialThenCourierNewThenTheFirst) {
+  addFamily(u"Aardvark", {u"Regular"});
+  addFamily(u"Courier New", {u"Regular"});
+  {
+    addFamily(u"Arial", {u"Bold", u"Regular", u"Black"});
+    FontCache cache(system_);
+    EXPECT_EQ(cache.findFont(u"zzz", u"zzz", u"zzz").postScriptName, u"Arial-Regular");
+    EXPECT_FALSE(cache.hasFont(u"zzz", u"zzz", u"zzz"));
+  }
+  system_->faces.erase(system_->faces.end() - 3, system_->faces.end());
+  {
+    FontCache cache(system_);
+    EXPECT_EQ(cache.findFont(u"zzz", u"zzz", u"zzz").postScriptName, u"Courier New-Regular");
+  }
+  system_->faces.erase(system_->faces.end() - 1, system_->faces.end());
+  {
+    FontCache cache(system_);
+    EXPECT_EQ(cache.findFont(u"zzz", u"zzz", u"zzz").postScriptName, u"Aardvark-Regular");
+  }
+}
+
+TEST_F(FontCacheOnFakeSystem, RasterAndVerticalFacesAreNeverListed) {
+  addFamily(u"Shown", {u"Regular"});
+  enumerate(u"Bitmap", u"Regular", u"Bitmap Regular", platform::kRasterFontType);
+  enumerate(u"@Shown", u"Regular", u"@Shown Regular");
+  enumerate(u"Printer", u"Regular", u"Printer Regular", platform::kDeviceFontType);
+  FontCache cache(system_);
+  EXPECT_EQ(cache.familyNames(), (std::set<std::u16string>{u"Printer", u"Shown"}));
+  EXPECT_FALSE(cache.hasFont(u"Bitmap Regular", u"Bitmap", u""));
+  EXPECT_FALSE(cache.hasFont(u"@Shown Regular", u"@Shown", u""));
+  EXPECT_EQ(cache.records().size(), 2u);
+}
+
+TEST_F(FontCacheOnFakeSystem, NothingInstalledGivesEmptyRecords) {
+  FontCache cache(system_);
+  EXPECT_TRUE(cache.familyNames().empty());
+  EXPECT_FALSE(cache.hasFont(u"Arial", u"Arial", u"Arial"));
+  const FontRecord record = cache.findFont(u"Arial", u"Arial", u"Arial");
+  EXPECT_TRUE(record.postScriptName.empty());
+  EXPECT_TRUE(record.filePath.empty());
+}
+
+TEST_F(FontCacheOnFakeSystem, NoFontsFolderIsAnError) {
+  system_->folder.reset();
+  try {
+    FontCache cache(system_);
+    FAIL() << "expected an error";
+  } catch (const std::runtime_error& error) {
+    EXPECT_STREQ(error.what(), "Cannot get system fonts path");
+  }
+}
+
+// This machine's catalogue through fontconfig: every DejaVu face by each of its names.
+TEST(FontCacheOnThisMachine, EveryDejaVuFaceIsFoundByEachOfItsNames) {
+  const std::filesystem::path folder = "/usr/share/fonts/truetype/dejavu";
+  if (!std::filesystem::exists(folder)) {
+    const char* ci = std::getenv("CI");
+    if (ci != nullptr && std::string(ci) == "true") {
+      FAIL() << "fonts-dejavu-core is not installed";
+    }
+    GTEST_SKIP() << "fonts-dejavu-core is not installed";
+  }
+  FontCache cache(platform::systemServices());
+  const std::set<std::u16string> families = cache.familyNames();
+  int faces = 0;
+  for (const auto& entry : std::filesystem::directory_iterator(folder)) {
+    const vesk::project::FontFileReader reader(utf16(entry.path().string()), 0x0409);
+    for (int32_t face = 0; face < reader.faceCount(); ++face, ++faces) {
+      const std::u16string postScript = reader.postScriptNameUtf16(face);
+      const std::u16string full = reader.fullNameUtf16(face);
+      const std::u16string family = reader.familyNameUtf16(face);
+      const std::string what = entry.path().string();
+      EXPECT_EQ(cache.findFont(postScript, u"", u"").filePath, utf16(entry.path().string()))
+          << what;
+      EXPECT_EQ(cache.findFont(u"", u"", full).postScriptName, postScript) << what;
+      EXPECT_EQ(cache.findFont(u"x", family, u"y").familyName, family) << what;
+      EXPECT_TRUE(cache.hasFont(postScript, u"", u"")) << what;
+      EXPECT_EQ(families.count(family), 1u) << what;
+    }
+  }
+  EXPECT_GE(faces, 6);
+}
+
+}  // namespace
+}  // namespace waveform_test
