@@ -11,7 +11,7 @@
 #include <utility>
 
 #include "fonts/byte_reader.h"
-#include "fonts/unicode_conversion.h"
+#include "platform/utf16_text.h"
 
 namespace vesk::project {
 
@@ -239,7 +239,7 @@ std::optional<std::string> decodeName(const ByteReader& file, uint16_t platformI
       }
       units += unit;
     }
-    return utf16ToUtf8(units);
+    return platform::toUtf8Strict(units);
   }
   std::string bytes;
   for (uint64_t i = 0; i < length && file.u8(start + i) != 0; ++i) {
@@ -418,7 +418,7 @@ std::vector<FontFileReader::Face> readFaces(Layout layout, const ByteReader& fil
 
 // The whole content of a regular file, or nothing when it cannot be read.
 std::vector<uint8_t> readFile(const std::u16string& path) {
-  const std::optional<std::string> utf8Path = utf16ToUtf8(path);
+  const std::optional<std::string> utf8Path = platform::toUtf8Strict(path);
   if (!utf8Path) {
     return {};
   }
@@ -630,6 +630,10 @@ float FontFileReader::underlineThickness(int32_t faceIndex) const {
     return 0.05f;
   }
   return inEm(f->underlineThickness, f->unitsPerEm);
+}
+
+std::u16string utf8ToUtf16(const std::string& text) {
+  return platform::toUtf16(text);
 }
 
 }  // namespace vesk::project

@@ -285,22 +285,6 @@ std::vector<Face> facesOf(FcFontSet* listed) {
   return faces;
 }
 
-// The name an installed-font list gives a file: family and style of its first face and the
-// kind of outlines; none for a file the list leaves out (bitmap-only, Type 1 and other formats
-// that are neither TrueType nor OpenType).
-std::optional<std::u16string> installedNameOf(const Face& first) {
-  if (!first.outline) {
-    return std::nullopt;
-  }
-  if (first.format == "TrueType") {
-    return joined(first.family, first.style) + u" (TrueType)";
-  }
-  if (first.format == "CFF") {
-    return joined(first.family, first.style) + u" (OpenType)";
-  }
-  return std::nullopt;
-}
-
 std::vector<uint8_t> fileBytes(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   if (!in) {
@@ -325,6 +309,21 @@ std::vector<std::string> userFontFolders() {
     folders.push_back(homeFolder + ".fonts/");
   }
   return folders;
+}
+
+std::optional<std::u16string> installedFontName(const std::u16string& family,
+                                                const std::u16string& style,
+                                                const std::string& format, bool outline) {
+  if (!outline) {
+    return std::nullopt;
+  }
+  if (format == "TrueType") {
+    return joined(family, style) + u" (TrueType)";
+  }
+  if (format == "CFF") {
+    return joined(family, style) + u" (OpenType)";
+  }
+  return std::nullopt;
 }
 
 FontHive fontHiveOfFile(const std::string& file, const std::vector<std::string>& userFolders) {
@@ -398,7 +397,8 @@ std::optional<std::vector<InstalledFont>> FontconfigFonts::installedFonts(FontHi
     if (fontHiveOfFile(face.file, state_->userFolders) != hive) {
       continue;
     }
-    const std::optional<std::u16string> name = installedNameOf(face);
+    const std::optional<std::u16string> name =
+        installedFontName(face.family, face.style, face.format, face.outline);
     if (!name) {
       continue;
     }

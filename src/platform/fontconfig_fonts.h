@@ -27,7 +27,7 @@ class FontconfigFonts {
 
   // The first system font directory (outside the user's font folders) that holds installed
   // fonts and lies inside no other such directory, ending in '/'. Falls back to the first
-  // system directory, then to the first directory; none when fontconfig reports none.
+  // existing system directory, then to the first directory; none when fontconfig reports none.
   std::optional<std::u16string> fontsFolder() const;
   // One entry per TrueType or CFF-based outline file of the hive; none without a configuration.
   std::optional<std::vector<InstalledFont>> installedFonts(FontHive hive) const;

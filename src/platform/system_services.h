@@ -95,6 +95,14 @@ std::vector<std::string> userFontFolders();
 // after lexical normalisation ("//", "/./", "/../"), without resolving links.
 FontHive fontHiveOfFile(const std::string& file, const std::vector<std::string>& userFolders);
 
+// The name an installed-font list gives a font file, from its first face: "<family> <style>"
+// followed by " (TrueType)" for TrueType outlines or " (OpenType)" for CFF outlines (`format` as
+// fontconfig names it: "TrueType", "CFF"); the style is left out when empty. None for a file the
+// list leaves out: bitmap-only (`outline` false, even in an sfnt wrapper) or another format.
+std::optional<std::u16string> installedFontName(const std::u16string& family,
+                                                const std::u16string& style,
+                                                const std::string& format, bool outline);
+
 }  // namespace platform
 
 #endif  // WAVEFORM_PLATFORM_SYSTEM_SERVICES_H

@@ -1,117 +1,144 @@
 #include "platform/utf16_text.h"
 
-#include <cstddef>
 #include <cstdint>
 
 namespace platform {
 namespace {
 
-constexpr char32_t kReplacement = 0xFFFD;
+constexpr char16_t kReplacement = 0xFFFD;
 
-// The length of the sequence a lead byte starts, and the smallest value it may encode (so that
-// overlong forms are refused); 0 for a byte that cannot start a sequence.
-struct Lead {
-  int length;
-  char32_t minimum;
-};
-
-Lead leadOf(unsigned char byte) {
-  if (byte < 0x80) {
-    return {1, 0};
-  }
-  if ((byte & 0xE0) == 0xC0) {
-    return {2, 0x80};
-  }
-  if ((byte & 0xF0) == 0xE0) {
-    return {3, 0x800};
-  }
-  if ((byte & 0xF8) == 0xF0) {
-    return {4, 0x10000};
-  }
-  return {0, 0};
-}
-
-// Decodes the sequence at `at`; on success advances `at` past it, otherwise by one byte and
-// answers U+FFFD.
-char32_t decodeOne(const std::string& text, size_t& at) {
-  const auto lead = static_cast<unsigned char>(text[at]);
-  const Lead shape = leadOf(lead);
-  if (shape.length == 0 || at + shape.length > text.size()) {
-    ++at;
-    return kReplacement;
-  }
-  char32_t value = shape.length == 1 ? lead : lead & (0x7F >> shape.length);
-  for (int i = 1; i < shape.length; ++i) {
-    const auto next = static_cast<unsigned char>(text[at + i]);
-    if ((next & 0xC0) != 0x80) {
-      ++at;
-      return kReplacement;
-    }
-    value = (value << 6) | (next & 0x3F);
-  }
-  if (value < shape.minimum || value > 0x10FFFF || (value >= 0xD800 && value <= 0xDFFF)) {
-    ++at;
-    return kReplacement;
-  }
-  at += shape.length;
-  return value;
-}
-
-void appendUtf8(std::string& out, char32_t value) {
-  if (value < 0x80) {
-    out += static_cast<char>(value);
-  } else if (value < 0x800) {
-    out += static_cast<char>(0xC0 | (value >> 6));
-    out += static_cast<char>(0x80 | (value & 0x3F));
-  } else if (value < 0x10000) {
-    out += static_cast<char>(0xE0 | (value >> 12));
-    out += static_cast<char>(0x80 | ((value >> 6) & 0x3F));
-    out += static_cast<char>(0x80 | (value & 0x3F));
-  } else {
-    out += static_cast<char>(0xF0 | (value >> 18));
-    out += static_cast<char>(0x80 | ((value >> 12) & 0x3F));
-    out += static_cast<char>(0x80 | ((value >> 6) & 0x3F));
-    out += static_cast<char>(0x80 | (value & 0x3F));
-  }
-}
-
-bool isHighSurrogate(char16_t unit) {
+bool isHighSurrogate(char32_t unit) {
   return unit >= 0xD800 && unit <= 0xDBFF;
 }
-bool isLowSurrogate(char16_t unit) {
+bool isLowSurrogate(char32_t unit) {
   return unit >= 0xDC00 && unit <= 0xDFFF;
+}
+
+void appendUtf8(char32_t codePoint, std::string& out) {
+  if (codePoint < 0x80) {
+    out += static_cast<char>(codePoint);
+  } else if (codePoint < 0x800) {
+    out += static_cast<char>(0xC0 | (codePoint >> 6));
+    out += static_cast<char>(0x80 | (codePoint & 0x3F));
+  } else if (codePoint < 0x10000) {
+    out += static_cast<char>(0xE0 | (codePoint >> 12));
+    out += static_cast<char>(0x80 | ((codePoint >> 6) & 0x3F));
+    out += static_cast<char>(0x80 | (codePoint & 0x3F));
+  } else {
+    out += static_cast<char>(0xF0 | (codePoint >> 18));
+    out += static_cast<char>(0x80 | ((codePoint >> 12) & 0x3F));
+    out += static_cast<char>(0x80 | ((codePoint >> 6) & 0x3F));
+    out += static_cast<char>(0x80 | (codePoint & 0x3F));
+  }
+}
+
+void appendUtf16(char32_t codePoint, std::u16string& out) {
+  if (codePoint < 0x10000) {
+    out += static_cast<char16_t>(codePoint);
+  } else {
+    codePoint -= 0x10000;
+    out += static_cast<char16_t>(0xD800 + (codePoint >> 10));
+    out += static_cast<char16_t>(0xDC00 + (codePoint & 0x3FF));
+  }
+}
+
+// The well-formed UTF-8 sequences a lead byte starts: how many continuation bytes follow, the
+// bits the lead contributes, and the range allowed for the first continuation byte (narrower
+// after E0, ED, F0 and F4, which excludes overlong forms, surrogates and code points past
+// U+10FFFF). A byte that starts no sequence has no continuation count.
+struct Utf8Lead {
+  int continuations = -1;
+  char32_t bits = 0;
+  uint8_t firstLow = 0x80;
+  uint8_t firstHigh = 0xBF;
+};
+
+Utf8Lead utf8Lead(uint8_t byte) {
+  if (byte >= 0xC2 && byte <= 0xDF) {
+    return {1, static_cast<char32_t>(byte & 0x1F)};
+  }
+  if (byte >= 0xE0 && byte <= 0xEF) {
+    return {2, static_cast<char32_t>(byte & 0x0F), static_cast<uint8_t>(byte == 0xE0 ? 0xA0 : 0x80),
+            static_cast<uint8_t>(byte == 0xED ? 0x9F : 0xBF)};
+  }
+  if (byte >= 0xF0 && byte <= 0xF4) {
+    return {3, static_cast<char32_t>(byte & 0x07), static_cast<uint8_t>(byte == 0xF0 ? 0x90 : 0x80),
+            static_cast<uint8_t>(byte == 0xF4 ? 0x8F : 0xBF)};
+  }
+  return {};
 }
 
 }  // namespace
 
-std::u16string toUtf16(const std::string& utf8) {
-  std::u16string out;
-  out.reserve(utf8.size());
-  size_t at = 0;
-  while (at < utf8.size()) {
-    const char32_t value = decodeOne(utf8, at);
-    if (value < 0x10000) {
-      out += static_cast<char16_t>(value);
-    } else {
-      out += static_cast<char16_t>(0xD800 + ((value - 0x10000) >> 10));
-      out += static_cast<char16_t>(0xDC00 + ((value - 0x10000) & 0x3FF));
+std::string toUtf8(const std::u16string& text) {
+  std::string out;
+  out.reserve(text.size());
+  for (size_t i = 0; i < text.size(); ++i) {
+    char32_t unit = text[i];
+    if (isHighSurrogate(unit) && i + 1 < text.size() && isLowSurrogate(text[i + 1])) {
+      unit = 0x10000 + ((unit - 0xD800) << 10) + (text[i + 1] - 0xDC00);
+      ++i;
+    } else if (isHighSurrogate(unit) || isLowSurrogate(unit)) {
+      unit = kReplacement;
     }
+    appendUtf8(unit, out);
   }
   return out;
 }
 
-std::string toUtf8(const std::u16string& utf16) {
+std::optional<std::string> toUtf8Strict(const std::u16string& text) {
   std::string out;
-  out.reserve(utf16.size());
-  for (size_t at = 0; at < utf16.size(); ++at) {
-    const char16_t unit = utf16[at];
-    if (isHighSurrogate(unit) && at + 1 < utf16.size() && isLowSurrogate(utf16[at + 1])) {
-      appendUtf8(out, 0x10000 + ((char32_t(unit) - 0xD800) << 10) + (utf16[at + 1] - 0xDC00));
-      ++at;
-    } else if (isHighSurrogate(unit) || isLowSurrogate(unit)) {
-      appendUtf8(out, kReplacement);
+  out.reserve(text.size());
+  for (size_t i = 0; i < text.size(); ++i) {
+    char32_t unit = text[i];
+    if (isHighSurrogate(unit)) {
+      if (i + 1 == text.size() || !isLowSurrogate(text[i + 1])) {
+        return std::nullopt;
+      }
+      unit = 0x10000 + ((unit - 0xD800) << 10) + (text[i + 1] - 0xDC00);
+      ++i;
+    } else if (isLowSurrogate(unit)) {
+      return std::nullopt;
+    }
+    appendUtf8(unit, out);
+  }
+  return out;
+}
+
+std::u16string toUtf16(const std::string& text) {
+  std::u16string out;
+  out.reserve(text.size());
+  size_t i = 0;
+  while (i < text.size()) {
+    const auto byte = static_cast<uint8_t>(text[i++]);
+    if (byte < 0x80) {
+      out += static_cast<char16_t>(byte);
+      continue;
+    }
+    const Utf8Lead lead = utf8Lead(byte);
+    if (lead.continuations < 0) {
+      out += kReplacement;
+      continue;
+    }
+    char32_t codePoint = lead.bits;
+    uint8_t low = lead.firstLow;
+    uint8_t high = lead.firstHigh;
+    bool complete = true;
+    for (int k = 0; k < lead.continuations; ++k) {
+      const auto next = i < text.size() ? static_cast<uint8_t>(text[i]) : 0;
+      if (i == text.size() || next < low || next > high) {
+        complete = false;
+        break;
+      }
+      codePoint = (codePoint << 6) | (next & 0x3F);
+      ++i;
+      low = 0x80;
+      high = 0xBF;
+    }
+    if (complete) {
+      appendUtf16(codePoint, out);
     } else {
-      appendUtf8(out, unit);
+      out += kReplacement;
     }
   }
   return out;

@@ -1,17 +1,20 @@
-// UTF-8 <-> UTF-16 conversion for the platform layer only: fontconfig, the environment and the
-// file system speak UTF-8, the services answer in UTF-16.
+// UTF-8 <-> UTF-16 conversion: fontconfig, the environment, the file system and font files speak
+// UTF-8 or UTF-16, the services and the font catalogue answer in UTF-16.
 #ifndef WAVEFORM_PLATFORM_UTF16_TEXT_H
 #define WAVEFORM_PLATFORM_UTF16_TEXT_H
 
+#include <optional>
 #include <string>
 
 namespace platform {
 
-// Malformed UTF-8 (a stray continuation byte, a truncated or overlong sequence, an encoded
-// surrogate, a value above U+10FFFF) becomes one U+FFFD per offending byte.
+// Each malformed sequence becomes one U+FFFD: a byte that starts no sequence, or the longest
+// well-formed beginning of a sequence that is cut short (the byte that breaks it starts anew).
 std::u16string toUtf16(const std::string& utf8);
 // An unpaired surrogate becomes U+FFFD.
 std::string toUtf8(const std::u16string& utf16);
+// Nothing when the text holds an unpaired surrogate.
+std::optional<std::string> toUtf8Strict(const std::u16string& utf16);
 
 }  // namespace platform
 
