@@ -36,6 +36,7 @@ class FakeSystem : public platform::SystemServices {
   std::optional<std::u16string> folder;
   std::map<FontHive, std::optional<std::vector<InstalledFont>>> lists;
   std::vector<EnumeratedFace> faces;
+  mutable std::vector<std::u16string> askedFaceNames;  // by the second enumeration pass
 
   std::optional<std::u16string> fontsFolder() const override { return folder; }
   std::optional<std::vector<InstalledFont>> installedFonts(FontHive hive) const override {
@@ -56,6 +57,7 @@ class FakeSystem : public platform::SystemServices {
     return families;
   }
   std::vector<EnumeratedFace> enumerateFaces(const std::u16string& faceName) const override {
+    askedFaceNames.push_back(faceName);
     std::vector<EnumeratedFace> found;
     for (const EnumeratedFace& face : faces) {
       if (face.faceName.substr(0, 31) == faceName) {
@@ -316,6 +318,15 @@ TEST_F(FontCacheOnFakeSystem, RasterAndVerticalFacesAreNeverListed) {
   EXPECT_FALSE(cache.hasFont(u"Bitmap Regular", u"Bitmap", u""));
   EXPECT_FALSE(cache.hasFont(u"@Shown Regular", u"@Shown", u""));
   EXPECT_EQ(cache.records().size(), 2u);
+}
+
+TEST_F(FontCacheOnFakeSystem, LongFamilyNamesAreEnumeratedByTheirFirst31Units) {
+  const std::u16string family = u"A Family Name Longer Than Thirty-One Units";
+  addFamily(family, {u"Regular"});
+  FontCache cache(system_);
+  EXPECT_EQ(cache.familyNames(), std::set<std::u16string>{family});
+  EXPECT_EQ(cache.findFont(u"", family, u"x").styleName, u"Regular");
+  EXPECT_EQ(system_->askedFaceNames, std::vector<std::u16string>{family.substr(0, 31)});
 }
 
 TEST_F(FontCacheOnFakeSystem, NothingInstalledGivesEmptyRecords) {
