@@ -6,12 +6,14 @@
 #   scope_bench     whole HD frames through the reference host: render, scope control drawing,
 #                   both, for each mode and layout (--runs N)
 #   font_cache_bench  the font catalogue's first load and its lookups (--runs N)
-#   scripts/bench.sh [--only analysis|scope|fonts] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]
+#   glyph_geometry_bench  outline building and triangulation of every DejaVu Sans glyph
+#   scripts/bench.sh [--only analysis|scope|fonts|glyphs] [--runs N] [--quick] [--no-ffmpeg]
+#                    [--folder DIR]
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 
 usage() {
-  echo "usage: scripts/bench.sh [--only analysis|scope|fonts] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
+  echo "usage: scripts/bench.sh [--only analysis|scope|fonts|glyphs] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
   exit 2
 }
 
@@ -45,8 +47,8 @@ while (($# > 0)); do
       ;;
   esac
 done
-if [[ -n "$only" && "$only" != analysis && "$only" != scope && "$only" != fonts ]]; then
-  echo "bench: --only takes analysis, scope or fonts, not '$only'" >&2
+if [[ -n "$only" && ! "$only" =~ ^(analysis|scope|fonts|glyphs)$ ]]; then
+  echo "bench: --only takes analysis, scope, fonts or glyphs, not '$only'" >&2
   usage
 fi
 
@@ -62,4 +64,8 @@ if [[ -z "$only" || "$only" == scope ]]; then
 fi
 if [[ -z "$only" || "$only" == fonts ]]; then
   "$root/build/bench/font_cache_bench" "${scope_arguments[@]}"
+  [[ -n "$only" ]] || echo
+fi
+if [[ -z "$only" || "$only" == glyphs ]]; then
+  "$root/build/bench/glyph_geometry_bench"
 fi

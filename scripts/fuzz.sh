@@ -4,6 +4,8 @@
 #   scripts/fuzz.sh [SECONDS [LIBFUZZER-OPTION...]]   run for SECONDS (default 600)
 # Inputs that crash, leak or time out are saved under build-fuzz/fuzz/artifacts/; the corpus
 # grows in build-fuzz/fuzz/corpus/ and is reused by the next run.
+# FUZZ_TARGET=polygon_triangulation fuzzes the triangulator instead (no seeds; its corpus and
+# artifacts live in build-fuzz/fuzz/polygon_corpus/ and polygon_artifacts/).
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 seconds="${1:-600}"
@@ -13,18 +15,35 @@ if ! [[ "$seconds" =~ ^[0-9]+$ ]]; then
   exit 2
 fi
 
+target="${FUZZ_TARGET:-font_file_reader}"
+case "$target" in
+  font_file_reader | polygon_triangulation) ;;
+  *)
+    echo "FUZZ_TARGET must be font_file_reader or polygon_triangulation" >&2
+    exit 2
+    ;;
+esac
+
 "$root/scripts/setup.sh" --fuzz
 build_dir="$root/build-fuzz"
 cmake -S "$root" -B "$build_dir" -G Ninja \
   -DCMAKE_C_COMPILER=clang -DCMAKE_CXX_COMPILER=clang++ \
   -DWAVEFORM_SANITIZE=ON -DWAVEFORM_FUZZ=ON -DWAVEFORM_BUILD_TESTS=OFF >/dev/null
-cmake --build "$build_dir" --target font_file_reader_fuzzer write_seed_fonts
-
 work="$build_dir/fuzz"
-mkdir -p "$work/corpus" "$work/artifacts"
-"$work/write_seed_fonts" "$work/seeds"
 export ASAN_OPTIONS="${ASAN_OPTIONS:-detect_leaks=1}"
 export UBSAN_OPTIONS="${UBSAN_OPTIONS:-print_stacktrace=1}"
+if [[ "$target" == polygon_triangulation ]]; then
+  cmake --build "$build_dir" --target polygon_triangulation_fuzzer
+  mkdir -p "$work/polygon_corpus" "$work/polygon_artifacts"
+  "$work/polygon_triangulation_fuzzer" "$work/polygon_corpus" \
+    -max_len=1024 -max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 \
+    -artifact_prefix="$work/polygon_artifacts/" -print_final_stats=1 "$@"
+  exit
+fi
+
+cmake --build "$build_dir" --target font_file_reader_fuzzer write_seed_fonts
+mkdir -p "$work/corpus" "$work/artifacts"
+"$work/write_seed_fonts" "$work/seeds"
 "$work/font_file_reader_fuzzer" "$work/corpus" "$work/seeds" \
   -max_len=65536 -max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 \
   -artifact_prefix="$work/artifacts/" -print_final_stats=1 "$@"
