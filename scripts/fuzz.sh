@@ -4,8 +4,9 @@
 #   scripts/fuzz.sh [SECONDS [LIBFUZZER-OPTION...]]   run for SECONDS (default 600)
 # Inputs that crash, leak or time out are saved under build-fuzz/fuzz/artifacts/; the corpus
 # grows in build-fuzz/fuzz/corpus/ and is reused by the next run.
-# FUZZ_TARGET=polygon_triangulation fuzzes the triangulator instead (no seeds; its corpus and
-# artifacts live in build-fuzz/fuzz/polygon_corpus/ and polygon_artifacts/).
+# FUZZ_TARGET=polygon_triangulation fuzzes the triangulator instead, FUZZ_TARGET=glyph_outline
+# the whole glyph geometry (contours to loops, containment tree and triangles); neither has seeds,
+# and their corpus and artifacts live in build-fuzz/fuzz/<target>_corpus/ and _artifacts/.
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 seconds="${1:-600}"
@@ -17,9 +18,9 @@ fi
 
 target="${FUZZ_TARGET:-font_file_reader}"
 case "$target" in
-  font_file_reader | polygon_triangulation) ;;
+  font_file_reader | polygon_triangulation | glyph_outline) ;;
   *)
-    echo "FUZZ_TARGET must be font_file_reader or polygon_triangulation" >&2
+    echo "FUZZ_TARGET must be font_file_reader, polygon_triangulation or glyph_outline" >&2
     exit 2
     ;;
 esac
@@ -32,12 +33,14 @@ cmake -S "$root" -B "$build_dir" -G Ninja \
 work="$build_dir/fuzz"
 export ASAN_OPTIONS="${ASAN_OPTIONS:-detect_leaks=1}"
 export UBSAN_OPTIONS="${UBSAN_OPTIONS:-print_stacktrace=1}"
-if [[ "$target" == polygon_triangulation ]]; then
-  cmake --build "$build_dir" --target polygon_triangulation_fuzzer
-  mkdir -p "$work/polygon_corpus" "$work/polygon_artifacts"
-  "$work/polygon_triangulation_fuzzer" "$work/polygon_corpus" \
+if [[ "$target" != font_file_reader ]]; then
+  cmake --build "$build_dir" --target "${target}_fuzzer"
+  corpus="$work/${target}_corpus"
+  artifacts="$work/${target}_artifacts"
+  mkdir -p "$corpus" "$artifacts"
+  "$work/${target}_fuzzer" "$corpus" \
     -max_len=1024 -max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 \
-    -artifact_prefix="$work/polygon_artifacts/" -print_final_stats=1 "$@"
+    -artifact_prefix="$artifacts/" -print_final_stats=1 "$@"
   exit
 fi
 

@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cmath>
 
 #include "geometry/triangulate_pieces.h"
 #include "geometry/triangulation.h"
@@ -84,6 +85,43 @@ TEST(TriangulatePiecesTest, PiecesAreConcatenatedWithOffsetIndices) {
     }
   }
   EXPECT_FLOAT_EQ(coveredArea(outline), 3);
+}
+
+// Found by fuzzing: a long thin contour whose end turns back by a tenth of a degree. Cleaning
+// may treat that turn as a spike and drop its point when the loop is cut; whatever loop the
+// shape keeps, the fill covers it exactly once.
+TEST(TriangulatePiecesTest, HairlineSpikeIsCleanedAwayAndTheRestCoveredOnce) {
+  const PointList thin = {{32.79f, -0.99f},
+                          {22.36f, -0.96f},
+                          {10.71f, -0.91f},
+                          {-2.16f, -0.84f},
+                          {-16.25f, -0.75f},
+                          {-31.56f, -0.64f},
+                          {-48.09f, -0.51f},
+                          {-65.84f, -0.36f},
+                          {-84.81f, -0.19f},
+                          {-105, 0},
+                          {0, 0},
+                          {1.36f, -0.36f},
+                          {3.36f, -0.51f},
+                          {6.24f, -0.64f},
+                          {10, -0.75f},
+                          {14.64f, -0.84f},
+                          {20.16f, -0.91f},
+                          {26.56f, -0.96f}};
+  CharacterOutline outline = outlineOf({reversed(thin)});
+  const std::vector<const Shape2f*> pieces = collectFilledPieces(outline.shape);
+  ASSERT_EQ(pieces.size(), 1u);
+  const PointList& loop = pieces[0]->path.points;
+  EXPECT_GE(loop.size(), thin.size() - 1);
+  float loopArea = 0;
+  for (size_t i = 0; i < loop.size(); ++i) {
+    const Point2f a = loop[i];
+    const Point2f b = loop[(i + 1) % loop.size()];
+    loopArea += 0.5f * (a.x * b.y - b.x * a.y);
+  }
+  triangulatePieces(outline);
+  EXPECT_NEAR(std::fabs(coveredArea(outline)), std::fabs(loopArea), 1e-3f * std::fabs(loopArea));
 }
 
 TEST(TriangulatePiecesTest, NoPieceGivesAnEmptyFilledCache) {
