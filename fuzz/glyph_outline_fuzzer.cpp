@@ -74,13 +74,35 @@ double shoelace(const PointList& points) {
   return twice / 2;
 }
 
-// Whether two non-adjacent edges of the polygon touch or cross: then the contour is not simple.
+double cross(Point2f o, Point2f a, Point2f b) {
+  return static_cast<double>(a.x - o.x) * (b.y - o.y) -
+         static_cast<double>(a.y - o.y) * (b.x - o.x);
+}
+
+double distanceToSegment(Point2f p, Point2f a, Point2f b) {
+  const double dx = b.x - a.x, dy = b.y - a.y;
+  const double length2 = dx * dx + dy * dy;
+  double t = length2 > 0 ? ((p.x - a.x) * dx + (p.y - a.y) * dy) / length2 : 0;
+  t = t < 0 ? 0 : t > 1 ? 1 : t;
+  const double ex = a.x + t * dx - p.x, ey = a.y + t * dy - p.y;
+  return std::sqrt(ex * ex + ey * ey);
+}
+
+// Whether the polygon is simple with some room to spare: no two non-adjacent edges come within
+// a thousandth of a pixel of each other, and no corner turns back along its own edge. A loop
+// that is simple only by float rounding (a path retraced a hair's breadth away) is no reference:
+// ear clipping may cover such a sliver more than once, as it is allowed to on degenerate rings.
 bool isSimple(const PointList& points) {
+  constexpr double kRoom = 1e-3;
   const size_t n = points.size();
-  const auto cross = [](Point2f o, Point2f a, Point2f b) {
-    return static_cast<double>(a.x - o.x) * (b.y - o.y) -
-           static_cast<double>(a.y - o.y) * (b.x - o.x);
-  };
+  for (size_t i = 0; i < n; ++i) {
+    const Point2f a = points[(i + n - 1) % n], b = points[i], c = points[(i + 1) % n];
+    const double dot =
+        static_cast<double>(b.x - a.x) * (c.x - b.x) + static_cast<double>(b.y - a.y) * (c.y - b.y);
+    if (dot < 0 && std::fabs(cross(a, b, c)) < kRoom * std::sqrt(-dot)) {
+      return false;  // a spike: the corner turns back along its edge
+    }
+  }
   for (size_t i = 0; i < n; ++i) {
     for (size_t j = i + 1; j < n; ++j) {
       if (j == i + 1 || (i == 0 && j == n - 1)) {
@@ -89,8 +111,10 @@ bool isSimple(const PointList& points) {
       const Point2f a = points[i], b = points[(i + 1) % n], c = points[j], d = points[(j + 1) % n];
       const double d1 = cross(a, b, c), d2 = cross(a, b, d), d3 = cross(c, d, a),
                    d4 = cross(c, d, b);
-      if (((d1 <= 0 && d2 >= 0) || (d1 >= 0 && d2 <= 0)) &&
-          ((d3 <= 0 && d4 >= 0) || (d3 >= 0 && d4 <= 0))) {
+      const bool crossing = ((d1 <= 0 && d2 >= 0) || (d1 >= 0 && d2 <= 0)) &&
+                            ((d3 <= 0 && d4 >= 0) || (d3 >= 0 && d4 <= 0));
+      if (crossing || distanceToSegment(a, c, d) < kRoom || distanceToSegment(b, c, d) < kRoom ||
+          distanceToSegment(c, a, b) < kRoom || distanceToSegment(d, a, b) < kRoom) {
         return false;
       }
     }

@@ -45,6 +45,29 @@ bool farEnough(Point2f p, Point2f last) {
   return std::fabs(p.x - last.x) > 1.0f || std::fabs(p.y - last.y) > 1.0f;
 }
 
+// Appends `start`, then walks `steps - 1` forward-difference steps from it, each adding the first
+// difference `d` and then letting `advance` update the differences, and appends every sample
+// more than a pixel from the last appended one.
+template <typename Advance>
+void walkDifferences(Point2f start, Point2f d, float steps, PointList& points, Advance advance) {
+  reserveSteps(steps, points);
+  Point2f p = start;
+  points.push_back(p);
+  Point2f last = p;
+  if (steps - 1.0f > 0.0f) {
+    long i = 0;
+    do {
+      p = p + d;
+      if (farEnough(p, last)) {
+        points.push_back(p);
+        last = p;
+      }
+      ++i;
+      advance(d);
+    } while (steps - 1.0f > static_cast<float>(i));
+  }
+}
+
 }  // namespace
 
 LinearCurve::LinearCurve(Point2f start, Point2f end) : start_(start), end_(end) {}
@@ -62,25 +85,10 @@ QuadraticCurve::QuadraticCurve(Point2f start, Point2f control, Point2f end)
 // difference starts at 2(C - P0)h + A h^2 and grows by the constant 2A h^2 each step.
 void QuadraticCurve::flatten(float steps, float step, float step2, float /*step3*/,
                              PointList& points) const {
-  reserveSteps(steps, points);
   const Point2f a = start_ - 2.0f * control_ + end_;
-  Point2f d = 2.0f * (control_ - start_) * step + a * step2;
+  const Point2f d = 2.0f * (control_ - start_) * step + a * step2;
   const Point2f e = 2.0f * a * step2;
-  Point2f p = start_;
-  points.push_back(p);
-  Point2f last = p;
-  if (steps - 1.0f > 0.0f) {
-    long i = 0;
-    do {
-      p = p + d;
-      if (farEnough(p, last)) {
-        points.push_back(p);
-        last = p;
-      }
-      ++i;
-      d = d + e;
-    } while (steps - 1.0f > static_cast<float>(i));
-  }
+  walkDifferences(start_, d, steps, points, [&](Point2f& first) { first = first + e; });
 }
 
 CubicCurve::CubicCurve(Point2f start, Point2f control1, Point2f control2, Point2f end)
@@ -90,29 +98,16 @@ CubicCurve::CubicCurve(Point2f start, Point2f control1, Point2f control2, Point2
 // starts at c h + b h^2 + a h^3, the second at 2b h^2 + 6a h^3, the third is the constant 6a h^3.
 void CubicCurve::flatten(float steps, float step, float step2, float step3,
                          PointList& points) const {
-  reserveSteps(steps, points);
   const Point2f a = -start_ + 3.0f * control1_ - 3.0f * control2_ + end_;
   const Point2f b = 3.0f * start_ - 6.0f * control1_ + 3.0f * control2_;
   const Point2f c = 3.0f * control1_ - 3.0f * start_;
-  Point2f d = c * step + b * step2 + a * step3;
+  const Point2f d = c * step + b * step2 + a * step3;
   Point2f e = 2.0f * b * step2 + 6.0f * a * step3;
   const Point2f f = 6.0f * a * step3;
-  Point2f p = start_;
-  points.push_back(p);
-  Point2f last = p;
-  if (steps - 1.0f > 0.0f) {
-    long i = 0;
-    do {
-      p = p + d;
-      if (farEnough(p, last)) {
-        points.push_back(p);
-        last = p;
-      }
-      ++i;
-      d = d + e;
-      e = e + f;
-    } while (steps - 1.0f > static_cast<float>(i));
-  }
+  walkDifferences(start_, d, steps, points, [&](Point2f& first) {
+    first = first + e;
+    e = e + f;
+  });
 }
 
 }  // namespace vesk::plugin::lib

@@ -34,6 +34,8 @@ struct FontCheck {
   int glyphs = 0;
   int filled = 0;      // glyphs with any area
   int mismatched = 0;  // glyphs whose triangles' area differs from the contours' by over 0.1 %
+  int triangles = 0;
+  int flat = 0;  // triangles of no area: ears clipped from a ring that had no proper one
   std::string firstMismatch;
 };
 
@@ -60,9 +62,12 @@ FontCheck checkEveryGlyph(const std::string& path) {
     qvtl::geometry::triangulatePieces(*outline);
     double triangles = 0;
     for (size_t i = 0; i + 2 < outline->indices.size(); i += 3) {
-      triangles += std::fabs(shoelace({outline->vertices[outline->indices[i]],
-                                       outline->vertices[outline->indices[i + 1]],
-                                       outline->vertices[outline->indices[i + 2]]}));
+      const double area = std::fabs(shoelace({outline->vertices[outline->indices[i]],
+                                              outline->vertices[outline->indices[i + 1]],
+                                              outline->vertices[outline->indices[i + 2]]}));
+      triangles += area;
+      ++check.triangles;
+      check.flat += area < 1e-6 ? 1 : 0;
     }
     check.filled += contours > 0 ? 1 : 0;
     if (std::fabs(triangles - contours) > 0.001 * contours + 1e-3) {
@@ -95,8 +100,9 @@ TEST(GlyphArea, TrianglesCoverTheContoursOfEveryGlyph) {
       continue;
     }
     const FontCheck check = checkEveryGlyph(path);
-    std::printf("%s: %d glyphs checked, %d with area, %d mismatched\n", path.c_str(), check.glyphs,
-                check.filled, check.mismatched);
+    std::printf("%s: %d glyphs checked, %d with area, %d mismatched; %d triangles, %d flat\n",
+                path.c_str(), check.glyphs, check.filled, check.mismatched, check.triangles,
+                check.flat);
     EXPECT_GT(check.filled, 500) << path;
     EXPECT_EQ(check.mismatched, 0) << path << ", first: " << check.firstMismatch;
   }
