@@ -74,6 +74,10 @@ QuadVertices textureQuad(const vtpl::HostTexture& t, GLuint width, GLuint height
   return {0, 0, t.uMin, t.vMin, w, 0, t.uMax, t.vMin, 0, h, t.uMin, t.vMax, w, h, t.uMax, t.vMax};
 }
 
+QuadVertices rectangleQuad(float left, float bottom, float right, float top) {
+  return {left, bottom, 0, 0, right, bottom, 1, 0, left, top, 0, 1, right, top, 1, 1};
+}
+
 Matrix4 multiplyMatrices(const Matrix4& a, const Matrix4& b) {
   Matrix4 product{};
   for (int column = 0; column < 4; ++column) {

@@ -23,6 +23,8 @@ void unbindTextureUnit(GLenum unit, GLenum target, bool nearest);
 
 // A triangle strip over (0, 0)..(width, height) with the texture's coordinate rectangle.
 QuadVertices textureQuad(const vtpl::HostTexture& texture, GLuint width, GLuint height);
+// A triangle strip over (left, bottom)..(right, top), texture coordinates spanning 0..1 once.
+QuadVertices rectangleQuad(float left, float bottom, float right, float top);
 
 // B x A: A applied first, then B.
 Matrix4 multiplyMatrices(const Matrix4& a, const Matrix4& b);

@@ -154,11 +154,11 @@ void drawBlendPass(const Plugin::gl::HostCalls& host, EffectData& programs, cons
   setRect(programs, kScopeRectUniform, pass.scopeRect);
 
   const auto& [xmin, ymin, xmax, ymax] = pass.quad;
-  const float quad[16] = {xmin, ymin, 0, 0, xmax, ymin, 1, 0, xmin, ymax, 0, 1, xmax, ymax, 1, 1};
+  const Plugin::gl::QuadVertices quad = Plugin::gl::rectangleQuad(xmin, ymin, xmax, ymax);
   Plugin::gl::bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, pass.layerTexture, true);
   Plugin::gl::bindTextureUnit(GL_TEXTURE1, GL_TEXTURE_2D, pass.scopeTexture, true);
   glDisable(GL_BLEND);
-  Plugin::gl::drawQuadArrays(host, quad, 4, GL_TRIANGLE_STRIP);
+  Plugin::gl::drawQuadArrays(host, quad.data(), 4, GL_TRIANGLE_STRIP);
   programs.releaseProgram();
   glActiveTexture(GL_TEXTURE0);
 }

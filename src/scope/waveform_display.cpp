@@ -123,12 +123,6 @@ void setMatrices(EffectData& programs, const Plugin::gl::Matrix4& projection,
                             modelView.data());
 }
 
-// (x, y, u, v) corners of a triangle strip over the rectangle, the texture spanning it once.
-std::array<float, 16> rectangleQuad(const Rectangle& d) {
-  return {d.left, d.bottom, 0, 0, d.right, d.bottom, 1, 0,
-          d.left, d.top,    0, 1, d.right, d.top,    1, 1};
-}
-
 void createQuadProgram(EffectData& programs, const std::string& fragmentSource, bool echo,
                        const char* name) {
   if (programs.programId(name) >= 0) {
@@ -160,7 +154,8 @@ void drawWaveformDisplay(const Plugin::gl::HostCalls& host, EffectData& programs
   setMatrices(programs, projection, modelView);
   programs.setUniform1i(programs.uniformLocation(kWaveformSampler), 0);
   programs.setUniform1i(programs.uniformLocation(kDisplayIndexUniform), displayIndex);
-  const std::array<float, 16> quad = rectangleQuad(destination);
+  const Rectangle& d = destination;
+  const Plugin::gl::QuadVertices quad = Plugin::gl::rectangleQuad(d.left, d.bottom, d.right, d.top);
   Plugin::gl::bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, waveformTexture, true);
   Plugin::gl::drawQuadArrays(host, quad.data(), 4, GL_TRIANGLE_STRIP);
   Plugin::gl::unbindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, false);
@@ -175,7 +170,8 @@ void fillWaveformPanel(const Plugin::gl::HostCalls& host, EffectData& programs,
   setMatrices(programs, projection, modelView);
   programs.setUniform4f(programs.uniformLocation(kFillColourUniform), colour[0], colour[1],
                         colour[2], colour[3]);
-  const std::array<float, 16> quad = rectangleQuad(destination);
+  const Rectangle& d = destination;
+  const Plugin::gl::QuadVertices quad = Plugin::gl::rectangleQuad(d.left, d.bottom, d.right, d.top);
   Plugin::gl::drawQuadArrays(host, quad.data(), 4, GL_TRIANGLE_STRIP);
   programs.releaseProgram();
 }
