@@ -11,7 +11,7 @@
 #include <vector>
 
 #include "gl/framebuffer.h"
-#include "gl/host_textures.h"
+#include "gl/quad_maths.h"
 #include "gl_test_host.h"
 #include "headless_gl.h"
 #include "image.h"
@@ -172,10 +172,11 @@ int main(int argc, char** argv) {
         for (const int32_t mode : {kModeLuminance, kModeRGB, kModeCbCr}) {
           const double reference = options.ffmpeg ? ffmpegMilliseconds(png, mode, asFloat) : -1;
           for (const int32_t downsample : downsamples) {
-            host.parameters = {{"waveformMode", {float(mode), 0}},
-                               {"colorSpace", {709, 0}},
-                               {"waveformBrightness", {1, 0}},
-                               {"analysisDownsample", {float(downsample), 0}}};
+            AnalysisSettings settings;
+            settings.mode = mode;
+            settings.colorSpace = kRec709;
+            settings.brightness = 1;
+            settings.downsample = downsample;
             AnalysisInput input;
             input.layer = layer;
             input.target = Plugin::gl::Texture::create();
@@ -191,7 +192,7 @@ int main(int argc, char** argv) {
             for (int run = 0; run < options.runs; ++run) {
               glFinish();
               const auto start = Clock::now();
-              analyseLayer(host.calls(), {programs, pool, lock, true}, input);
+              analyseLayer(host.calls(), {programs, pool, lock, true}, settings, input);
               glFinish();
               times.push_back(
                   std::chrono::duration<double, std::milli>(Clock::now() - start).count());

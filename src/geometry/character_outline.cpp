@@ -4,6 +4,8 @@
 #include <cmath>
 #include <utility>
 
+#include "geometry/triangulate_pieces.h"
+
 namespace qvtl::geometry {
 namespace {
 
@@ -95,6 +97,8 @@ std::shared_ptr<CharacterOutline> makeCharacterOutline(
     loops += addPath(outline->shape, contour.path, allowed);
   }
   normaliseOrientation(outline->shape);
+  // Triangulated now, so that an outline shared between threads is never written while read.
+  triangulatePieces(*outline);
   return outline;
 }
 

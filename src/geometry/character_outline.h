@@ -1,5 +1,6 @@
 // A glyph's geometry for the GPU text passes: its contours flattened into paths with room for
-// band geometry, the containment tree of its simple loops, and the lazily filled triangulation.
+// band geometry, the containment tree of its simple loops, and its triangles. Complete when
+// built and never changed afterwards, so that threads may share it.
 #ifndef WAVEFORM_GEOMETRY_CHARACTER_OUTLINE_H
 #define WAVEFORM_GEOMETRY_CHARACTER_OUTLINE_H
 
@@ -33,7 +34,7 @@ struct CharacterOutline {
   uint32_t glyphIndex = 0;
   std::vector<OutlineContour> contours;
   Shape2f shape;
-  // Triangulation cache, filled on first use.
+  // The filled area as triangles, made when the outline is built.
   bool triangulated = false;
   std::vector<uint32_t> indices;   // 3 per triangle, all pieces concatenated
   PointList vertices;              // all pieces' vertices concatenated
@@ -68,7 +69,7 @@ constexpr std::size_t kMaxGlyphPoints = 65536;
 constexpr std::size_t kMaxLoopsPerGlyph = 1024;
 
 // Builds the outline: each contour gets id (its index + 1); the shape's outermost loops end up
-// counter-clockwise with their subtrees flipped to match.
+// counter-clockwise with their subtrees flipped to match; the filled pieces are triangulated.
 std::shared_ptr<CharacterOutline> makeCharacterOutline(
     const vesk::plugin::lib::GlyphDescriptor& descriptor, const GlyphOutlineRequest& request);
 

@@ -2,8 +2,8 @@
 
 #include <string>
 
-#include "gl/host_textures.h"
-#include "gl/plugin_exception.h"
+#include "gl/quad_maths.h"
+#include "gl/texture_units.h"
 #include "gl/textured_quad_program.h"
 #include "gl/vertex_attributes.h"
 #include "gl/vertex_buffer.h"
@@ -41,20 +41,13 @@ void main() {
 }  // namespace
 
 void ensureCopyAndClearPrograms(EffectData& programs, bool echo) {
-  if (programs.programId(kClearProgram) < 0) {
-    programs.addProgram(kClearVertexSource, kClearFragmentSource, echo, kClearProgram);
-    programs.bindAttribute(kClearProgram, kPositionLocation, kStoredPositionName);
-    if (!programs.linkProgram(kClearProgram, echo)) {
-      throw PluginException(kUnableToLinkClearShaderText);
-    }
-  }
-  if (programs.programId(kCopyProgram) < 0) {
-    programs.createProgram(kTexturedQuadVertexSource, kCopyFragmentSource, echo, kCopyProgram, true,
-                           true);
-  }
+  programs.ensureProgram(kClearProgram, {kClearVertexSource, {}, kClearFragmentSource},
+                         {echo, AttributeNames::kStored, TexCoords::kNone});
+  programs.ensureProgram(kCopyProgram, {kTexturedQuadVertexSource, {}, kCopyFragmentSource},
+                         {echo, AttributeNames::kStored, TexCoords::kOne});
 }
 
-void copyPass(const HostCalls& host, EffectData& programs, const vtpl::HostTexture& source,
+void copyPass(const host::HostCalls& host, EffectData& programs, const vtpl::HostTexture& source,
               const vtpl::HostTexture& target) {
   const auto* render = static_cast<const vtpl::HostRenderRecord*>(host.record().messageRecord);
   if (programs.programId(kCopyProgram) < 0 || render == nullptr) {

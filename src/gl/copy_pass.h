@@ -4,7 +4,7 @@
 #define WAVEFORM_GL_COPY_PASS_H
 
 #include "gl/effect_data.h"
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 #include "vtpl/host_interface.h"
 
 namespace Plugin::gl {
@@ -12,14 +12,13 @@ namespace Plugin::gl {
 inline constexpr char kCopyProgram[] = "glCopy";
 inline constexpr char kClearProgram[] = "glClear";
 
-// Builds whichever of the two programs the registry lacks. A clear program that does not link
-// raises PluginException "Unable to link clear shader.".
+// Builds whichever of the two programs the registry lacks; a failure throws QvGLSLexception.
 void ensureCopyAndClearPrograms(EffectData& programs, bool echo);
 
 // Draws `source` over the render record's frame into `target`, then leaves the render record's
 // destination attached and its source bound on unit 0 for the next stage. Does nothing without
 // "glCopy" or without a render record.
-void copyPass(const HostCalls& host, EffectData& programs, const vtpl::HostTexture& source,
+void copyPass(const host::HostCalls& host, EffectData& programs, const vtpl::HostTexture& source,
               const vtpl::HostTexture& target);
 
 }  // namespace Plugin::gl

@@ -8,7 +8,6 @@
 #include "gl/shader_log.h"
 #include "gl/shader_program.h"
 #include "gl/vertex_attributes.h"
-#include "vtpl/host_interface.h"
 
 namespace Plugin::gl {
 namespace {
@@ -67,56 +66,45 @@ bool EffectData::linkProgram(int32_t index, bool echo) {
   }
   log.append(program.log);
   if (program.linked == 0) {
-    throw QvGLSLexception(GLSLErrorType_ShaderLink);
+    throw QvGLSLexception(GLSLErrorType_ShaderLink, program.log);
   }
   return true;
 }
 
-int32_t EffectData::createProgram(const std::string& vertexSource,
-                                  const std::string& geometrySource,
-                                  const std::string& fragmentSource, bool echo,
-                                  const std::string& name, bool useStoredNames) {
-  addProgram(vertexSource, geometrySource, fragmentSource, echo, name);
-  bindStandardAttributes(useStoredNames, true, false);
-  return linkNewest(echo);
+void EffectData::createProgram(const std::string& name, const ProgramSources& sources,
+                               const ProgramOptions& options) {
+  addProgram(sources.vertex, sources.geometry, sources.fragment, options.echo, name);
+  bindStandardAttributes(options);
+  linkProgram(programCount() - 1, options.echo);
 }
 
-int32_t EffectData::createProgram(const std::string& vertexSource,
-                                  const std::string& fragmentSource, bool echo,
-                                  const std::string& name, bool useStoredNames, bool withTexCoord) {
-  addProgram(vertexSource, fragmentSource, echo, name);
-  bindStandardAttributes(useStoredNames, withTexCoord, false);
-  return linkNewest(echo);
-}
-
-int32_t EffectData::createProgramTwoTexCoords(const std::string& vertexSource,
-                                              const std::string& fragmentSource, bool echo,
-                                              const std::string& name, bool useStoredNames) {
-  addProgram(vertexSource, fragmentSource, echo, name);
-  bindStandardAttributes(useStoredNames, true, true);
-  return linkNewest(echo);
+void EffectData::ensureProgram(const std::string& name, const ProgramSources& sources,
+                               const ProgramOptions& options) {
+  if (programId(name) < 0) {
+    createProgram(name, sources, options);
+  }
 }
 
 // Binds on the newest program: the attribute locations must be fixed before its link.
-void EffectData::bindStandardAttributes(bool useStoredNames, bool withTexCoord, bool twoTexCoords) {
+void EffectData::bindStandardAttributes(const ProgramOptions& options) {
   const GLuint program = programs_.back()->name;
+  const bool stored = options.names == AttributeNames::kStored;
   glBindAttribLocation(program, kPositionLocation,
-                       useStoredNames ? kStoredPositionName : kPlainPositionName);
-  if (!withTexCoord) {
-    return;
+                       stored ? kStoredPositionName : kPlainPositionName);
+  switch (options.texCoords) {
+    case TexCoords::kNone:
+      break;
+    case TexCoords::kOne:
+      glBindAttribLocation(program, kTexCoordLocation,
+                           stored ? kStoredTexCoordName : kPlainTexCoordName);
+      break;
+    case TexCoords::kTwo:
+      glBindAttribLocation(program, kTexCoordLocation,
+                           stored ? kStoredTexCoordName : kPlainFirstTexCoordName);
+      glBindAttribLocation(program, kSecondTexCoordLocation,
+                           stored ? kStoredSecondTexCoordName : kPlainSecondTexCoordName);
+      break;
   }
-  const char* texCoord = useStoredNames ? kStoredTexCoordName
-                         : twoTexCoords ? kPlainFirstTexCoordName
-                                        : kPlainTexCoordName;
-  glBindAttribLocation(program, kTexCoordLocation, texCoord);
-  if (twoTexCoords) {
-    glBindAttribLocation(program, kSecondTexCoordLocation,
-                         useStoredNames ? kStoredSecondTexCoordName : kPlainSecondTexCoordName);
-  }
-}
-
-int32_t EffectData::linkNewest(bool echo) {
-  return linkProgram(programCount() - 1, echo) ? vtpl::kResultHandled : vtpl::kResultFailed;
 }
 
 int32_t EffectData::indexOf(const std::string& name) const {

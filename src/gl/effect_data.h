@@ -16,6 +16,24 @@ namespace Plugin::gl {
 
 struct ShaderProgram;
 
+// The stages of a program; an empty geometry source builds none.
+struct ProgramSources {
+  std::string vertex;
+  std::string geometry;
+  std::string fragment;
+};
+
+// Which names the program's sources declare their attributes under.
+enum class AttributeNames { kPlain, kStored };
+// How many texture coordinates the program takes besides its position.
+enum class TexCoords { kNone, kOne, kTwo };
+
+struct ProgramOptions {
+  bool echo = false;  // print build logs that hold a warning or an error
+  AttributeNames names = AttributeNames::kStored;
+  TexCoords texCoords = TexCoords::kOne;
+};
+
 class EffectData {
  public:
   EffectData();
@@ -29,21 +47,17 @@ class EffectData {
                           const std::string& fragmentSource, bool echo, const std::string& name);
   virtual void addProgram(const std::string& vertexSource, const std::string& fragmentSource,
                           bool echo, const std::string& name);
-  // Links a registered program; throws QvGLSLexception (link) on failure. An unknown name
-  // answers false.
+  // Links a registered program; throws QvGLSLexception (link) with the program's log on
+  // failure. An unknown name answers false.
   virtual bool linkProgram(const std::string& name, bool echo);
   virtual bool linkProgram(int32_t index, bool echo);
-  // Add, bind the attributes (plain names or the stored sources' names) and link the newest
-  // program. Return 1 when linked, 5 otherwise.
-  virtual int32_t createProgram(const std::string& vertexSource, const std::string& geometrySource,
-                                const std::string& fragmentSource, bool echo,
-                                const std::string& name, bool useStoredNames);
-  virtual int32_t createProgram(const std::string& vertexSource, const std::string& fragmentSource,
-                                bool echo, const std::string& name, bool useStoredNames,
-                                bool withTexCoord);
-  virtual int32_t createProgramTwoTexCoords(const std::string& vertexSource,
-                                            const std::string& fragmentSource, bool echo,
-                                            const std::string& name, bool useStoredNames);
+  // Adds the program, binds position to 0 and the texture coordinates the options ask for (8,
+  // then 9), and links it. A failure throws QvGLSLexception with the driver's log.
+  virtual void createProgram(const std::string& name, const ProgramSources& sources,
+                             const ProgramOptions& options);
+  // createProgram, unless the registry already has a program of that name.
+  void ensureProgram(const std::string& name, const ProgramSources& sources,
+                     const ProgramOptions& options);
   // Destroys the programs from the newest to the oldest.
   virtual ~EffectData();
 
@@ -73,8 +87,7 @@ class EffectData {
 
  private:
   int32_t indexOf(const std::string& name) const;
-  void bindStandardAttributes(bool useStoredNames, bool withTexCoord, bool twoTexCoords);
-  int32_t linkNewest(bool echo);
+  void bindStandardAttributes(const ProgramOptions& options);
 
   std::vector<std::unique_ptr<ShaderProgram>> programs_;    // in creation order
   std::vector<std::pair<std::string, int32_t>> nameIndex_;  // sorted by name

@@ -33,7 +33,7 @@ void QvShader::compile(const std::string& source, ShaderLog& log) {
   }
   log.append(log_);
   if (compiled_ == 0) {
-    throw QvGLSLexception(GLSLErrorType_ShaderCompile);
+    throw QvGLSLexception(GLSLErrorType_ShaderCompile, log_);
   }
 }
 

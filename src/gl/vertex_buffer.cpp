@@ -9,23 +9,17 @@ constexpr GLsizei kVertexStride = 4 * sizeof(float);
 
 }  // namespace
 
-VertexBufferObjectRAII::VertexBufferObjectRAII(const HostCalls& host, const void* data,
-                                               GLuint sizeBytes, GLenum usage, bool keepBuffer)
-    : record_(&host.record()), context_(host.context()), keepBuffer_(keepBuffer) {
-  name_ =
-      host.call(&vtpl::HostEffectRecord::createBuffer, static_cast<uint32_t>(target_),
-                static_cast<uint32_t>(sizeBytes), data, static_cast<uint32_t>(usage), &filled_, 0);
-  glBindBuffer(target_, name_);
+VertexBufferObjectRAII::VertexBufferObjectRAII(const host::HostCalls& host, const void* data,
+                                               GLuint sizeBytes, GLenum usage, GLenum target)
+    : buffer_(host, target, data, sizeBytes, usage), target_(target) {
+  glBindBuffer(target_, buffer_.name());
 }
 
 VertexBufferObjectRAII::~VertexBufferObjectRAII() {
   glBindBuffer(target_, 0);
-  if (!keepBuffer_ && record_->releaseBuffer != nullptr) {
-    record_->releaseBuffer(context_, name_);
-  }
 }
 
-void drawQuadArrays(const HostCalls& host, const float* vertices, GLsizei vertexCount,
+void drawQuadArrays(const host::HostCalls& host, const float* vertices, GLsizei vertexCount,
                     GLenum mode) {
   glBindVertexArray(host.call(&vtpl::HostEffectRecord::vertexArray));
   {
@@ -43,7 +37,7 @@ void drawQuadArrays(const HostCalls& host, const float* vertices, GLsizei vertex
   glBindVertexArray(0);
 }
 
-void drawPositionArrays(const HostCalls& host, const float* vertices, GLsizei vertexCount,
+void drawPositionArrays(const host::HostCalls& host, const float* vertices, GLsizei vertexCount,
                         GLenum mode) {
   constexpr GLsizei kPositionStride = 2 * sizeof(float);
   glBindVertexArray(host.call(&vtpl::HostEffectRecord::vertexArray));

@@ -2,28 +2,32 @@
 
 #include <cstring>
 
-#include "gl/host_textures.h"
+#include "gl/quad_maths.h"
+#include "gl/texture_units.h"
 #include "plugin/instance_lifecycle.h"
 #include "plugin/scopes_effect_data.h"
 #include "plugin/waveform_results.h"
-#include "scope/comparison_layer.h"
-#include "scope/parameter_ids.h"
+#include "gl/pass_state_guard.h"
+#include "plugin/comparison_layer.h"
+#include "plugin/parameter_ids.h"
+#include "plugin/scope_settings_reader.h"
 #include "scope/scope_composition.h"
 #include "scope/waveform_analysis.h"
 
 namespace plugin::Scopes {
 namespace {
 
-using Plugin::gl::HostCalls;
+using Plugin::host::HostCalls;
 using vtpl::HostEffectRecord;
 
 constexpr char kControlId[] = "waveformControl";
+constexpr int32_t kDisplayTime = 0;
 
 // A fetched layer analysed with "WaveformUI" over its own size.
 std::shared_ptr<Plugin::gl::Texture> analyseFetchedLayer(const HostCalls& host,
                                                          ScopesEffectData& instance,
-                                                         const vtpl::HostTexture& layer,
-                                                         int32_t time) {
+                                                         const AnalysisSettings& settings,
+                                                         const vtpl::HostTexture& layer) {
   const float width = static_cast<float>(layer.width);
   const float height = static_cast<float>(layer.height);
   const Plugin::gl::Matrix4 projection = Plugin::gl::orthographicMatrix(width, height);
@@ -31,73 +35,81 @@ std::shared_ptr<Plugin::gl::Texture> analyseFetchedLayer(const HostCalls& host,
   input.layer = layer;
   input.target = acquireTexture(
       instance, layer.width, waveformTextureHeight(layer.format, layer.height), layer.format, 1.0f);
-  input.time = time;
   input.frameWidth = static_cast<int32_t>(layer.width);
   input.frameHeight = static_cast<int32_t>(layer.height);
   input.projection = projection.data();
   input.modelView = Plugin::gl::kIdentityMatrix.data();
   input.interfaceProgram = true;
-  analyseLayer(host, analysisResources(instance), input);
+  analyseLayer(host, analysisResources(instance), settings, input);
   return input.target;
+}
+
+// Stores the analysis of a fetched layer, measured over the layer's own size.
+void storeFetchedResult(const HostCalls& host, ScopesEffectData& instance,
+                        const AnalysisSettings& settings, ScopesSharedData& shared,
+                        WaveformResult ScopesSharedData::*slot, const vtpl::HostTexture& layer) {
+  storeResult(shared, slot, analyseFetchedLayer(host, instance, settings, layer),
+              static_cast<int32_t>(layer.width), static_cast<int32_t>(layer.height));
 }
 
 // The control's frame analysed on this thread: the comparison layer and the own layer, fetched
 // from the host and handed back afterwards.
 void analyseOnInterfaceThread(const HostCalls& host, ScopesEffectData& instance,
                               ScopesSharedData& shared, const vtpl::HostControlRecord& control) {
-  const vtpl::HostTexture comparison =
-      fetchComparisonLayer(host, control.time, 0, control.frameIndex);
-  const bool showComparison =
-      host.call(&HostEffectRecord::getBool, ParamId::kShowComparison, control.time) != 0;
-  const int32_t type = host.call(&HostEffectRecord::getInt, ParamId::kScopeComparisonType, 0);
-  const LayerChoice layers = chooseLayers(comparison.name != 0, type, showComparison);
+  Plugin::host::LayerHandle comparison =
+      fetchComparisonLayer(host, control.time, 0, control.frameIndex, nullptr);
+  const AnalysisSettings settings = readAnalysisSettings(host, control.time);
+  const ComparisonSettings choice = readComparisonSettings(host, control.time);
+  const LayerChoice layers = chooseLayers(!comparison.empty(), choice.type, choice.showComparison);
   shared.analysedFrame = control.frameIndex;
   if (layers.comparison) {
-    storeResult(shared, &ScopesSharedData::comparison,
-                analyseFetchedLayer(host, instance, comparison, control.time),
-                static_cast<int32_t>(comparison.width), static_cast<int32_t>(comparison.height));
+    storeFetchedResult(host, instance, settings, shared, &ScopesSharedData::comparison,
+                       comparison.texture());
   } else {
     storeResult(shared, &ScopesSharedData::comparison, nullptr, 1, 1);
   }
-  if (comparison.name != 0) {
-    host.call(&HostEffectRecord::releaseLayer, nullptr, comparison.name);
-  }
+  comparison.release();
   if (!layers.own) {
     storeResult(shared, &ScopesSharedData::primary, nullptr, 1, 1);
     return;
   }
-  vtpl::HostTexture own{};
-  host.call(&HostEffectRecord::fetchOwnLayer, 0, control.frameIndex, &own);
-  if (own.name == 0) {
+  vtpl::HostTexture fetched{};
+  host.call(&HostEffectRecord::fetchOwnLayer, 0, control.frameIndex, &fetched);
+  Plugin::host::LayerHandle own(host, nullptr, fetched);
+  if (own.empty()) {
     return;
   }
-  storeResult(shared, &ScopesSharedData::primary,
-              analyseFetchedLayer(host, instance, own, control.time),
-              static_cast<int32_t>(own.width), static_cast<int32_t>(own.height));
-  host.call(&HostEffectRecord::releaseLayer, nullptr, own.name);
+  storeFetchedResult(host, instance, settings, shared, &ScopesSharedData::primary, own.texture());
+  own.release();
 }
 
 // The scope as the control shows it: the panel's background around a black waveform panel, the
 // display flags read at time 0, labels in the interface thread's text state.
 ScopeDrawing controlScopeDrawing(const HostCalls& host, const vtpl::HostControlRecord& control) {
-  constexpr int32_t kDisplayTime = 0;
+  const auto flag = [&host](const char* id) {
+    return host.call(&HostEffectRecord::getBool, id, kDisplayTime) != 0;
+  };
   ScopeDrawing drawing;
+  drawing.composition = readCompositionSettings(host);
   drawing.background = {static_cast<float>(control.backgroundRed),
                         static_cast<float>(control.backgroundGreen),
                         static_cast<float>(control.backgroundBlue), 1.0f};
-  drawing.showGuidelines =
-      host.call(&HostEffectRecord::getBool, ParamId::kShowGuidelines, kDisplayTime) != 0;
-  drawing.showAxisLabels =
-      host.call(&HostEffectRecord::getBool, ParamId::kShowsAxisLabel, kDisplayTime) != 0;
-  drawing.showColourBars =
-      host.call(&HostEffectRecord::getBool, ParamId::kShowStandardColorBars, kDisplayTime) != 0;
+  drawing.showGuidelines = flag(ParamId::kShowGuidelines);
+  drawing.showColourBars = flag(ParamId::kShowStandardColorBars);
+  drawing.labels = {flag(ParamId::kShowsAxisLabel), static_cast<float>(control.labelScaleX),
+                    static_cast<float>(control.labelScaleY), true};
   drawing.width = static_cast<float>(control.width);
   drawing.height = static_cast<float>(control.height);
-  drawing.labelScaleX = static_cast<float>(control.labelScaleX);
-  drawing.labelScaleY = static_cast<float>(control.labelScaleY);
   drawing.fillPanel = true;
-  drawing.interfaceThread = true;
   return drawing;
+}
+
+// The control analyses its frame itself when the render's results do not match it: asked to,
+// or stale, for a frame inside the clip that it has not analysed last.
+bool analysesOwnFrame(const ScopesSharedData& shared, const vtpl::HostControlRecord& control) {
+  return !isNoIdentifier(control.identifier) &&
+         (control.force != 0 || shared.resultsFresh.load() == 0) && control.frameIndex >= 0 &&
+         control.frameIndex < control.frameCount && control.frameIndex != shared.analysedFrame;
 }
 
 }  // namespace
@@ -109,22 +121,11 @@ int32_t drawControl(const HostCalls& host, ScopesEffectData& instance) {
     return vtpl::kResultHandled;
   }
   ScopesSharedData* shared = sharedDataOf(host.record());
-  if (shared != nullptr && !isNoIdentifier(control->identifier) &&
-      (control->force != 0 || shared->resultsFresh.load() == 0) && control->frameIndex >= 0 &&
-      control->frameIndex < control->frameCount && control->frameIndex != shared->analysedFrame) {
-    // The host's own drawing target is put back after the analysis.
-    GLint attached = 0;
-    GLint viewport[4] = {};
-    glGetFramebufferAttachmentParameteriv(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0,
-                                          GL_FRAMEBUFFER_ATTACHMENT_OBJECT_NAME, &attached);
-    glGetIntegerv(GL_VIEWPORT, viewport);
+  if (shared != nullptr && analysesOwnFrame(*shared, *control)) {
+    // The analysis draws into targets of its own; the host's drawing target comes back after it.
+    const Plugin::gl::PassStateGuard hostTarget(Plugin::gl::PassStateGuard::Restore::kAlways);
     analyseOnInterfaceThread(host, instance, *shared, *control);
     shared->resultsFresh.exchange(1);
-    if (attached != 0) {
-      glFramebufferTexture2D(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D,
-                             static_cast<GLuint>(attached), 0);
-      glViewport(viewport[0], viewport[1], viewport[2], viewport[3]);
-    }
   }
   drawScope(host, instance, takePublishedWaveforms(shared), controlScopeDrawing(host, *control));
   instance.releaseProgram();

@@ -4,7 +4,7 @@
 
 #include <cstdint>
 
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 
 namespace plugin::Scopes {
 
@@ -12,7 +12,7 @@ class ScopesEffectData;
 
 // Analyses the frame on this thread when the published results are stale (or a fresh drawing is
 // forced) and the frame was not analysed yet, and publishes the results. Answers 1.
-int32_t drawControl(const Plugin::gl::HostCalls& host, ScopesEffectData& instance);
+int32_t drawControl(const Plugin::host::HostCalls& host, ScopesEffectData& instance);
 
 }  // namespace plugin::Scopes
 

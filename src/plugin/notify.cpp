@@ -1,7 +1,10 @@
 #include "plugin/notify.h"
 
+#include <cstdio>
+
 #include "gl/glew_setup.h"
-#include "gl/host_calls.h"
+#include "gl/glsl_exception.h"
+#include "host_access/host_calls.h"
 #include "plugin/draw_control.h"
 #include "plugin/instance_lifecycle.h"
 #include "plugin/parameter_declarations.h"
@@ -15,12 +18,20 @@ namespace {
 
 using namespace vtpl;
 
+void reportShaderFailure(const Plugin::gl::QvGLSLexception& failure) noexcept {
+  std::fprintf(stderr, "Waveform: %s\n", failure.what());
+  if (!failure.log().empty()) {
+    std::fprintf(stderr, "%s\n", failure.log().c_str());
+  }
+  std::fflush(stderr);
+}
+
 const char* changedParameterId(const HostEffectRecord& record) {
   return record.changed != nullptr ? record.changed->id : nullptr;
 }
 
 int32_t handleMessage(HostContext context, HostEffectRecord& record, int32_t message) {
-  const Plugin::gl::HostCalls host(context, record);
+  const Plugin::host::HostCalls host(context, record);
   switch (message) {
     case kMessageCreateInstance:
       createInstance(record);
@@ -89,6 +100,11 @@ int32_t notify(HostContext context, HostEffectRecord* record, int32_t message) n
   }
   try {
     return handleMessage(context, *record, message);
+  } catch (const Plugin::gl::QvGLSLexception& failure) {
+    // A driver that cannot build a program says why only in its log: the user sees it whether or
+    // not the host asked for verbose output.
+    reportShaderFailure(failure);
+    return kResultFailed;
   } catch (...) {
     // The effect's own failures ("Plugin Error", shader failures) and anything a host callback or
     // the runtime throws alike: the host gets a failed result instead of a terminated process.

@@ -5,7 +5,7 @@
 #include <cstdint>
 #include <string>
 
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 
 namespace plugin::Scopes {
 
@@ -29,7 +29,7 @@ std::u16string joinChoiceTexts(const Items& items) {
 
 // Raises PluginException "Plugin Error" at the first declaration the host refuses; the
 // declarations before it stay with the host.
-void declareParameters(const Plugin::gl::HostCalls& host);
+void declareParameters(const Plugin::host::HostCalls& host);
 
 }  // namespace plugin::Scopes
 

@@ -4,12 +4,12 @@
 #include <string_view>
 
 #include "scope/parameter_choices.h"
-#include "scope/parameter_ids.h"
+#include "plugin/parameter_ids.h"
 
 namespace plugin::Scopes {
 namespace {
 
-using Plugin::gl::HostCalls;
+using Plugin::host::HostCalls;
 using vtpl::HostEffectRecord;
 namespace id = ParamId;
 

@@ -5,7 +5,7 @@
 
 #include <cstdint>
 
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 
 namespace plugin::Scopes {
 
@@ -16,10 +16,10 @@ inline constexpr char kEffectParentLayer[] = "Effect_Parent_Layer";
 int32_t colorSpaceForLayerHeight(int32_t height);
 
 // Message 7. `changedId` may be null (the host named nothing), which changes nothing.
-void parameterChanged(const Plugin::gl::HostCalls& host, const char* changedId);
+void parameterChanged(const Plugin::host::HostCalls& host, const char* changedId);
 
 // Messages 13 and 14: a colour space picked by hand stops following the layer.
-void parameterEdited(const Plugin::gl::HostCalls& host, const char* changedId);
+void parameterEdited(const Plugin::host::HostCalls& host, const char* changedId);
 
 }  // namespace plugin::Scopes
 

@@ -3,20 +3,20 @@
 #include <array>
 
 #include "gl/copy_pass.h"
-#include "gl/host_textures.h"
+#include "gl/texture_units.h"
 #include "plugin/instance_lifecycle.h"
 #include "plugin/scopes_effect_data.h"
 #include "plugin/waveform_results.h"
-#include "scope/comparison_layer.h"
+#include "plugin/comparison_layer.h"
+#include "plugin/scope_settings_reader.h"
 #include "scope/parameter_choices.h"
-#include "scope/parameter_ids.h"
 #include "scope/render_to_layer.h"
 #include "scope/waveform_analysis.h"
 
 namespace plugin::Scopes {
 namespace {
 
-using Plugin::gl::HostCalls;
+using Plugin::host::HostCalls;
 using vtpl::HostEffectRecord;
 
 constexpr int32_t kProgressTotal = 100;
@@ -40,8 +40,9 @@ class Progress {
 // A layer of the frame analysed into a new waveform texture of the output's format, as wide as
 // the reference size and as high as the output's format and the reference height ask.
 std::shared_ptr<Plugin::gl::Texture> analyseFrameLayer(
-    const HostCalls& host, ScopesEffectData& instance, const vtpl::HostRenderRecord& frame,
-    const vtpl::HostTexture& layer, const vtpl::HostTexture& reference, bool fullFrame) {
+    const HostCalls& host, ScopesEffectData& instance, const AnalysisSettings& settings,
+    const vtpl::HostRenderRecord& frame, const vtpl::HostTexture& layer,
+    const vtpl::HostTexture& reference, bool fullFrame) {
   const uint32_t format = frame.destination->format;
   AnalysisInput input;
   input.layer = layer;
@@ -49,7 +50,6 @@ std::shared_ptr<Plugin::gl::Texture> analyseFrameLayer(
       acquireTexture(instance, reference.width, waveformTextureHeight(format, reference.height),
                      format, frame.textureScale);
   input.fullFrame = fullFrame;
-  input.time = frame.time;
   input.frameWidth = frame.frameWidth;
   input.frameHeight = frame.frameHeight;
   input.layerScale[0] = frame.frameWidth > 0 ? float(layer.width) / frame.frameWidth : 1;
@@ -59,35 +59,43 @@ std::shared_ptr<Plugin::gl::Texture> analyseFrameLayer(
   input.projection = frame.projection;
   input.modelView = frame.modelView;
   input.linearInput = frame.linearLight != 0;
-  analyseLayer(host, analysisResources(instance), input);
+  analyseLayer(host, analysisResources(instance), settings, input);
   return input.target;
 }
 
-// Steps 3 to 6 of a frame: decide, analyse, publish.
+// Whether this frame's waveforms are needed: by an attached control (unless the host will not
+// show the frame), by a render without identifier, or by the scope rendered into the layer.
+bool needsAnalysis(const vtpl::HostRenderRecord& frame, const ScopesSharedData& shared,
+                   bool noIdentifier, bool blending) {
+  if (frame.unwatched != 0) {
+    return blending;
+  }
+  return shared.attachmentCount.load() > 0 || noIdentifier || blending;
+}
+
+// Analyses the comparison layer and the own layer as the comparison settings choose, and
+// publishes each result unless the host stopped the render meanwhile.
 void analyseAndPublish(const HostCalls& host, ScopesEffectData& instance, ScopesSharedData& shared,
                        const vtpl::HostRenderRecord& frame, bool noIdentifier, bool blending,
                        Progress& progress) {
-  const bool analyse = frame.unwatched != 0
-                           ? blending
-                           : shared.attachmentCount.load() > 0 || noIdentifier || blending;
-  if (!analyse || progress.stopped()) {
+  if (!needsAnalysis(frame, shared, noIdentifier, blending) || progress.stopped()) {
     if (frame.unwatched == 0 && shared.attachmentCount.load() <= 0 && !noIdentifier) {
       shared.resultsFresh.exchange(0);
     }
     return;
   }
-  const vtpl::HostTexture comparison =
-      fetchComparisonLayer(host, frame.time, frame.layerArgument, frame.frameIndex);
-  const bool showComparison =
-      host.call(&HostEffectRecord::getBool, ParamId::kShowComparison, frame.time) != 0;
-  const int32_t type = host.call(&HostEffectRecord::getInt, ParamId::kScopeComparisonType, 0);
-  const LayerChoice layers = chooseLayers(comparison.name != 0, type, showComparison);
+  Plugin::host::LayerHandle comparison =
+      fetchComparisonLayer(host, frame.time, frame.layerArgument, frame.frameIndex, &frame);
+  const AnalysisSettings settings = readAnalysisSettings(host, frame.time);
+  const ComparisonSettings choice = readComparisonSettings(host, frame.time);
+  const LayerChoice layers = chooseLayers(!comparison.empty(), choice.type, choice.showComparison);
 
   if (!progress.report(10)) {
     shared.analysedFrame = frame.frameIndex;
   }
   if (layers.comparison) {
-    auto waveform = analyseFrameLayer(host, instance, frame, comparison, comparison, noIdentifier);
+    auto waveform = analyseFrameLayer(host, instance, settings, frame, comparison.texture(),
+                                      comparison.texture(), noIdentifier);
     if (!progress.report(40)) {
       storeResult(shared, &ScopesSharedData::comparison, std::move(waveform), frame.frameWidth,
                   frame.frameHeight);
@@ -96,13 +104,11 @@ void analyseAndPublish(const HostCalls& host, ScopesEffectData& instance, Scopes
     storeResult(shared, &ScopesSharedData::comparison, nullptr, 1, 1);
   }
   // A fetched layer goes back to the host whether or not it was analysed.
-  if (comparison.name != 0) {
-    host.call(&HostEffectRecord::releaseLayer, &frame, comparison.name);
-  }
+  comparison.release();
   progress.report(50);
   if (layers.own && !progress.stopped()) {
-    auto waveform =
-        analyseFrameLayer(host, instance, frame, *frame.source, *frame.destination, noIdentifier);
+    auto waveform = analyseFrameLayer(host, instance, settings, frame, *frame.source,
+                                      *frame.destination, noIdentifier);
     if (!progress.report(80)) {
       storeResult(shared, &ScopesSharedData::primary, std::move(waveform), frame.frameWidth,
                   frame.frameHeight);
@@ -126,7 +132,7 @@ int32_t render(const HostCalls& host, ScopesEffectData& instance) {
   const bool noIdentifier = isNoIdentifier(frame->identifier);
   Progress progress(host);
   progress.report(0);
-  const int32_t blend = host.call(&HostEffectRecord::getInt, ParamId::kBlendType, frame->time);
+  const int32_t blend = readBlendType(host, frame->time);
   ScopesSharedData* shared = sharedDataOf(host.record());
   if (shared != nullptr) {
     analyseAndPublish(host, instance, *shared, *frame, noIdentifier, blend != kBlendNone, progress);
@@ -134,7 +140,8 @@ int32_t render(const HostCalls& host, ScopesEffectData& instance) {
 
   Plugin::gl::copyPass(host, instance, *frame->source, *frame->destination);
   if (!progress.report(90) && blend != kBlendNone) {
-    renderToLayer(host, instance, takePublishedWaveforms(shared), *frame, blend);
+    renderToLayer(host, instance, takePublishedWaveforms(shared), *frame,
+                  readRenderToLayerSettings(host, frame->time), readCompositionSettings(host));
   }
 
   // The host expects its output attached, nothing bound on unit 0 and no program in use.

@@ -4,7 +4,7 @@
 
 #include <cstdint>
 
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 
 namespace plugin::Scopes {
 
@@ -12,7 +12,7 @@ class ScopesEffectData;
 
 // Copies the layer to the output and leaves the GL state as the host expects it. A host that
 // asks to stop still gets its output. Answers 2 without a render record or its textures.
-int32_t render(const Plugin::gl::HostCalls& host, ScopesEffectData& instance);
+int32_t render(const Plugin::host::HostCalls& host, ScopesEffectData& instance);
 
 }  // namespace plugin::Scopes
 

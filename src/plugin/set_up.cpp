@@ -4,7 +4,7 @@
 
 #include "gl/copy_pass.h"
 #include "gl/glew_setup.h"
-#include "gl/plugin_exception.h"
+#include "host_access/plugin_exception.h"
 #include "plugin/scopes_effect_data.h"
 #include "scope/blend_shader.h"
 #include "scope/graticule_drawing.h"
@@ -13,11 +13,11 @@
 
 namespace plugin::Scopes {
 
-void setUp(const Plugin::gl::HostCalls& host, ScopesEffectData& instance) {
+void setUp(const Plugin::host::HostCalls& host, ScopesEffectData& instance) {
   // Without a current context GLEW loads nothing, and every later GL call would jump through a
   // null entry point: refuse instead.
   if (!Plugin::gl::initialiseGlew()) {
-    throw Plugin::gl::PluginException(Plugin::gl::kPluginErrorText);
+    throw Plugin::host::PluginException(Plugin::host::kPluginErrorText);
   }
   const bool verbose = host.record().verbose != 0;
   if (verbose) {

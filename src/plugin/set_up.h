@@ -3,13 +3,13 @@
 #ifndef WAVEFORM_PLUGIN_SET_UP_H
 #define WAVEFORM_PLUGIN_SET_UP_H
 
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 
 namespace plugin::Scopes {
 
 class ScopesEffectData;
 
-void setUp(const Plugin::gl::HostCalls& host, ScopesEffectData& instance);
+void setUp(const Plugin::host::HostCalls& host, ScopesEffectData& instance);
 
 }  // namespace plugin::Scopes
 

@@ -1,7 +1,7 @@
 #include "scope/blend_shader.h"
 
-#include "gl/host_textures.h"
-#include "gl/plugin_exception.h"
+#include "gl/quad_maths.h"
+#include "gl/texture_units.h"
 #include "gl/textured_quad_program.h"
 #include "gl/vertex_buffer.h"
 
@@ -134,16 +134,12 @@ const std::string& blendFragmentSource() {
 }
 
 void ensureBlendProgram(EffectData& programs, bool echo) {
-  if (programs.programId(kBlendShaderProgram) >= 0) {
-    return;
-  }
-  if (programs.createProgram(Plugin::gl::kTexturedQuadVertexSource, blendFragmentSource(), echo,
-                             kBlendShaderProgram, true, true) != vtpl::kResultHandled) {
-    throw Plugin::gl::PluginException(Plugin::gl::kUnableToLinkShaderText);
-  }
+  programs.ensureProgram(kBlendShaderProgram,
+                         {Plugin::gl::kTexturedQuadVertexSource, {}, blendFragmentSource()},
+                         {echo, Plugin::gl::AttributeNames::kStored, Plugin::gl::TexCoords::kOne});
 }
 
-void drawBlendPass(const Plugin::gl::HostCalls& host, EffectData& programs, const BlendPass& pass) {
+void drawBlendPass(const Plugin::host::HostCalls& host, EffectData& programs, const BlendPass& pass) {
   programs.useProgram(kBlendShaderProgram);
   setMatrix(programs, Plugin::gl::kProjectionUniform, pass.projection);
   setMatrix(programs, Plugin::gl::kModelViewUniform, pass.modelView);

@@ -9,7 +9,7 @@
 
 #include "gl/effect_data.h"
 #include "gl/gl_api.h"
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 
 namespace plugin::Scopes {
 
@@ -18,8 +18,8 @@ inline constexpr char kBlendShaderProgram[] = "blendShader";
 // The fragment stage of "blendShader".
 const std::string& blendFragmentSource();
 
-// Builds "blendShader" unless the registry has it; a link failure raises
-// PluginException "Unable to link shader".
+// Builds "blendShader" unless the registry has it; a build failure throws
+// QvGLSLexception with the driver's log.
 void ensureBlendProgram(Plugin::gl::EffectData& programs, bool echo);
 
 struct BlendPass {
@@ -38,7 +38,7 @@ struct BlendPass {
 // Draws the quad into the bound framebuffer with "blendShader" and GL blending off: the program
 // composites the scope over the layer itself. Leaves the layer bound on unit 0, the scope on
 // unit 1 and unit 0 active; unbinding is the caller's.
-void drawBlendPass(const Plugin::gl::HostCalls& host, Plugin::gl::EffectData& programs,
+void drawBlendPass(const Plugin::host::HostCalls& host, Plugin::gl::EffectData& programs,
                    const BlendPass& pass);
 
 }  // namespace plugin::Scopes

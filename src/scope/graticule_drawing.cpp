@@ -2,7 +2,6 @@
 
 #include <array>
 
-#include "gl/plugin_exception.h"
 #include "gl/textured_quad_program.h"
 #include "gl/vertex_attributes.h"
 #include "gl/vertex_buffer.h"
@@ -48,7 +47,7 @@ struct Line {
 };
 
 // Lines add their colour over what the target holds, weighted by their coverage.
-void drawLines(const Plugin::gl::HostCalls& host, EffectData& programs,
+void drawLines(const Plugin::host::HostCalls& host, EffectData& programs,
                const std::vector<Line>& lines, const GraticuleFrame& frame) {
   if (lines.empty()) {
     return;
@@ -79,18 +78,11 @@ void drawLines(const Plugin::gl::HostCalls& host, EffectData& programs,
 }  // namespace
 
 void ensureGuidelineProgram(EffectData& programs, bool echo) {
-  if (programs.programId(kGuidelineProgram) >= 0) {
-    return;
-  }
-  programs.addProgram(kGuidelineVertexSource, kGuidelineFragmentSource, echo, kGuidelineProgram);
-  programs.bindAttribute(kGuidelineProgram, Plugin::gl::kPositionLocation,
-                         Plugin::gl::kStoredPositionName);
-  if (!programs.linkProgram(kGuidelineProgram, echo)) {
-    throw Plugin::gl::PluginException(Plugin::gl::kUnableToLinkShaderText);
-  }
+  programs.ensureProgram(kGuidelineProgram, {kGuidelineVertexSource, {}, kGuidelineFragmentSource},
+                         {echo, Plugin::gl::AttributeNames::kStored, Plugin::gl::TexCoords::kNone});
 }
 
-void drawGuidelines(const Plugin::gl::HostCalls& host, EffectData& programs,
+void drawGuidelines(const Plugin::host::HostCalls& host, EffectData& programs,
                     const GuidelineList& guidelines, float left, float right,
                     const GraticuleFrame& frame) {
   std::vector<Line> lines;
@@ -100,7 +92,7 @@ void drawGuidelines(const Plugin::gl::HostCalls& host, EffectData& programs,
   drawLines(host, programs, lines, frame);
 }
 
-void drawColourBarMarkers(const Plugin::gl::HostCalls& host, EffectData& programs,
+void drawColourBarMarkers(const Plugin::host::HostCalls& host, EffectData& programs,
                           const std::vector<ColourBarMarker>& markers,
                           const GraticuleFrame& frame) {
   std::vector<Line> lines;

@@ -6,16 +6,16 @@
 #include <vector>
 
 #include "gl/effect_data.h"
-#include "gl/host_calls.h"
-#include "gl/host_textures.h"
+#include "host_access/host_calls.h"
+#include "gl/quad_maths.h"
 #include "scope/guidelines.h"
 
 namespace plugin::Scopes {
 
 inline constexpr char kGuidelineProgram[] = "guideline";
 
-// Builds "guideline" unless the registry has it; a link failure raises PluginException
-// "Unable to link shader".
+// Builds "guideline" unless the registry has it; a build failure throws
+// QvGLSLexception with the driver's log.
 void ensureGuidelineProgram(Plugin::gl::EffectData& programs, bool echo);
 
 // The scope's coordinate frame: its matrices, and the vertical extent of the quads a line is
@@ -28,12 +28,12 @@ struct GraticuleFrame {
 };
 
 // One faint grey line per guideline, from `left` to `right`, blended over the target.
-void drawGuidelines(const Plugin::gl::HostCalls& host, Plugin::gl::EffectData& programs,
+void drawGuidelines(const Plugin::host::HostCalls& host, Plugin::gl::EffectData& programs,
                     const GuidelineList& lines, float left, float right,
                     const GraticuleFrame& frame);
 
 // One opaque line per marker in its bar's colour.
-void drawColourBarMarkers(const Plugin::gl::HostCalls& host, Plugin::gl::EffectData& programs,
+void drawColourBarMarkers(const Plugin::host::HostCalls& host, Plugin::gl::EffectData& programs,
                           const std::vector<ColourBarMarker>& markers, const GraticuleFrame& frame);
 
 }  // namespace plugin::Scopes

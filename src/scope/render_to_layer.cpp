@@ -3,46 +3,33 @@
 #include <algorithm>
 #include <cmath>
 
-#include "gl/host_textures.h"
+#include "gl/texture_units.h"
+#include "host_access/working_texture.h"
 #include "scope/blend_shader.h"
-#include "scope/parameter_ids.h"
+#include "gl/pass_state_guard.h"
 #include "scope/scope_composition.h"
 
 namespace plugin::Scopes {
 namespace {
 
-using Plugin::gl::HostCalls;
-using vtpl::HostEffectRecord;
+using Plugin::host::HostCalls;
 
 constexpr float kSmallestSide = 16.0f;
 
-FramePoint readPoint(const HostCalls& host, const char* id, int32_t time) {
-  FramePoint point{};
-  host.call(&HostEffectRecord::getPoint, id, time, &point[0], &point[1]);
-  return point;
-}
-
-bool readBool(const HostCalls& host, const char* id, int32_t time) {
-  return host.call(&HostEffectRecord::getBool, id, time) != 0;
-}
-
 // The scope as the render-to-layer parameters ask for it: no black panel, labels in the render
 // thread's text state.
-ScopeDrawing layerScopeDrawing(const HostCalls& host, int32_t time,
+ScopeDrawing layerScopeDrawing(const RenderToLayerSettings& settings,
+                               const CompositionSettings& composition,
                                const ScopePlacement& placement) {
   ScopeDrawing drawing;
-  drawing.showGuidelines = readBool(host, ParamId::kRenderToLayerShowGuidelines, time);
-  drawing.showAxisLabels = readBool(host, ParamId::kRenderToLayerShowsAxisLabel, time);
-  drawing.showColourBars = readBool(host, ParamId::kRenderToLayerShowStandardColorBars, time);
-  const float labelScale =
-      host.call(&HostEffectRecord::getFloat, ParamId::kRenderToLayerLabelScale, time);
-  auto& [red, green, blue, alpha] = drawing.background;
-  host.call(&HostEffectRecord::getColor, ParamId::kRenderToLayerBackgroundColor, time, &red, &green,
-            &blue);
-  alpha = host.call(&HostEffectRecord::getFloat, ParamId::kRenderToLayerBackgroundAlpha, time);
+  drawing.composition = composition;
+  const auto& [red, green, blue] = settings.backgroundColour;
+  drawing.background = {red, green, blue, settings.backgroundAlpha};
+  drawing.showGuidelines = settings.showGuidelines;
+  drawing.showColourBars = settings.showColourBars;
+  drawing.labels = {settings.showAxisLabels, settings.labelScale, settings.labelScale, false};
   drawing.width = placement.width;
   drawing.height = placement.height;
-  drawing.labelScaleX = drawing.labelScaleY = labelScale;
   return drawing;
 }
 
@@ -100,36 +87,34 @@ std::array<float, 4> scopeRectangle(const ScopePlacement& placement,
 
 void renderToLayer(const HostCalls& host, Plugin::gl::EffectData& programs,
                    const ScopeWaveforms& waveforms, const vtpl::HostRenderRecord& frame,
-                   int32_t blend) {
+                   const RenderToLayerSettings& settings, const CompositionSettings& composition) {
   if (frame.source == nullptr || frame.destination == nullptr || frame.projection == nullptr ||
       frame.modelView == nullptr) {
     return;
   }
-  const int32_t time = frame.time;
   const std::optional<ScopePlacement> placement =
-      placeScope(readPoint(host, ParamId::kScopePositionTL, time),
-                 readPoint(host, ParamId::kScopePositionBR, time),
-                 static_cast<float>(frame.frameWidth), static_cast<float>(frame.frameHeight));
+      placeScope(settings.topLeft, settings.bottomRight, static_cast<float>(frame.frameWidth),
+                 static_cast<float>(frame.frameHeight));
   if (!placement) {
     return;
   }
-  const ScopeDrawing drawing = layerScopeDrawing(host, time, *placement);
-  const vtpl::HostTexture scope = Plugin::gl::acquireWorkingTexture(
+  const Plugin::gl::PassStateGuard stateGuard;
+  Plugin::host::LayerHandle scope = Plugin::host::acquireWorkingTexture(
       host, placement->textureWidth, placement->textureHeight, false, false);
-  if (scope.name == 0) {
+  if (scope.empty()) {
     return;  // the host had no texture to give
   }
-  Plugin::gl::attachTexture(scope, 0, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D);
-  drawScope(host, programs, waveforms, drawing);
+  Plugin::gl::attachTexture(scope.texture(), 0, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D);
+  drawScope(host, programs, waveforms, layerScopeDrawing(settings, composition, *placement));
 
   Plugin::gl::attachTexture(*frame.destination, 0, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D);
   BlendPass pass;
   pass.layerTexture = frame.source->name;
-  pass.scopeTexture = scope.name;
-  pass.mode = blend;
+  pass.scopeTexture = scope.texture().name;
+  pass.mode = settings.blend;
   pass.quad = {placement->left, placement->bottom, placement->right, placement->top};
   pass.layerRect = layerRectangle(*placement, *frame.source);
-  pass.scopeRect = scopeRectangle(*placement, scope);
+  pass.scopeRect = scopeRectangle(*placement, scope.texture());
   pass.projection = frame.projection;
   pass.modelView = frame.modelView;
   drawBlendPass(host, programs, pass);
@@ -137,7 +122,7 @@ void renderToLayer(const HostCalls& host, Plugin::gl::EffectData& programs,
   glFlush();
   Plugin::gl::unbindTextureUnit(GL_TEXTURE1, GL_TEXTURE_2D, false);
   glActiveTexture(GL_TEXTURE0);
-  host.call(&HostEffectRecord::releaseLayer, &frame, scope.name);
+  scope.release();
 }
 
 }  // namespace plugin::Scopes

@@ -8,13 +8,12 @@
 #include <optional>
 
 #include "gl/effect_data.h"
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
+#include "scope/scope_settings.h"
 #include "scope/waveform_result.h"
 #include "vtpl/host_interface.h"
 
 namespace plugin::Scopes {
-
-using FramePoint = std::array<float, 2>;  // x right, y up
 
 // Where the scope goes in the frame, in frame pixels with the origin at the lower-left corner.
 struct ScopePlacement {
@@ -37,12 +36,12 @@ std::array<float, 4> layerRectangle(const ScopePlacement& placement,
 std::array<float, 4> scopeRectangle(const ScopePlacement& placement,
                                     const vtpl::HostTexture& scope);
 
-// Draws the scope into the render's output over the area the parameters place it in, composited
-// with `blend` over the render's source layer. Expects the output attached to the bound
-// framebuffer and leaves it so.
-void renderToLayer(const Plugin::gl::HostCalls& host, Plugin::gl::EffectData& programs,
+// Draws the scope into the render's output over the area the settings place it in, composited
+// with their blend mode over the render's source layer, through a working texture the host
+// lends for the pass. Expects the output attached to the bound framebuffer and leaves it so.
+void renderToLayer(const Plugin::host::HostCalls& host, Plugin::gl::EffectData& programs,
                    const ScopeWaveforms& waveforms, const vtpl::HostRenderRecord& frame,
-                   int32_t blend);
+                   const RenderToLayerSettings& settings, const CompositionSettings& composition);
 
 }  // namespace plugin::Scopes
 

@@ -3,22 +3,19 @@
 #include <algorithm>
 #include <cmath>
 
-#include "gl/host_textures.h"
+#include "gl/quad_maths.h"
 #include "scope/channel_modes.h"
 #include "scope/graticule_drawing.h"
 #include "scope/guidelines.h"
 #include "scope/parameter_choices.h"
-#include "scope/parameter_ids.h"
+#include "gl/pass_state_guard.h"
 #include "scope/scope_layout.h"
 #include "scope/waveform_display.h"
 
 namespace plugin::Scopes {
 namespace {
 
-using Plugin::gl::HostCalls;
-using vtpl::HostEffectRecord;
-
-constexpr int32_t kLayoutTime = 0;
+using Plugin::host::HostCalls;
 constexpr std::array<float, 4> kPanelBlack = {0, 0, 0, 1};
 
 bool isExtended(const WaveformResult& result) {
@@ -56,15 +53,10 @@ void setColourMask(const ChannelMask& mask) {
 
 // Each waveform is screened onto what the target holds: source x (1 - target) + target.
 void drawWaveforms(const HostCalls& host, Plugin::gl::EffectData& programs,
-                   const ScopeLayout& layout, const std::vector<PanelPart>& parts,
-                   const Plugin::gl::Matrix4& projection) {
-  const int32_t mode = host.call(&HostEffectRecord::getInt, ParamId::kWaveformMode, kLayoutTime);
+                   const CompositionSettings& settings, const ScopeLayout& layout,
+                   const std::vector<PanelPart>& parts, const Plugin::gl::Matrix4& projection) {
   const bool overlay = layout.arrangement == ScopeArrangement::kOverlay;
-  OverlayRouting routing{};
-  if (overlay) {
-    routing = overlayRouting(
-        host.call(&HostEffectRecord::getInt, ParamId::kOverlayChannels, kLayoutTime));
-  }
+  const OverlayRouting routing = overlayRouting(settings.overlayChannels);
   glEnable(GL_BLEND);
   glBlendEquation(GL_FUNC_ADD);
   glBlendFunc(GL_ONE_MINUS_DST_COLOR, GL_ONE);
@@ -73,7 +65,8 @@ void drawWaveforms(const HostCalls& host, Plugin::gl::EffectData& programs,
       setColourMask(i == 0 ? routing.primary : routing.comparison);
     }
     drawWaveformDisplay(host, programs, parts[i].result->texture->name(), parts[i].area,
-                        displayIndexFor(mode, overlay), projection, Plugin::gl::kIdentityMatrix);
+                        displayIndexFor(settings.mode, overlay), projection,
+                        Plugin::gl::kIdentityMatrix);
   }
   glColorMask(GL_TRUE, GL_TRUE, GL_TRUE, GL_TRUE);
   glBlendEquation(GL_FUNC_ADD);
@@ -83,11 +76,9 @@ void drawWaveforms(const HostCalls& host, Plugin::gl::EffectData& programs,
 
 // Markers over each part that has a panel of its own (the overlaid scopes share the first one's),
 // each scaled to its own waveform's frame.
-void drawMarkers(const HostCalls& host, Plugin::gl::EffectData& programs, const ScopeLayout& layout,
-                 const std::vector<PanelPart>& parts, float drawingHeight,
-                 const GraticuleFrame& frame) {
-  const int32_t colorSpace =
-      host.call(&HostEffectRecord::getInt, ParamId::kColorSpace, kLayoutTime);
+void drawMarkers(const HostCalls& host, Plugin::gl::EffectData& programs, int32_t colorSpace,
+                 const ScopeLayout& layout, const std::vector<PanelPart>& parts,
+                 float drawingHeight, const GraticuleFrame& frame) {
   const size_t panels = layout.arrangement == ScopeArrangement::kOverlay ? 1 : parts.size();
   for (size_t i = 0; i < panels; ++i) {
     const WaveformResult& result = *parts[i].result;
@@ -112,20 +103,20 @@ void drawScope(const HostCalls& host, Plugin::gl::EffectData& programs,
   if (!(drawing.width >= 1.0f) || !(drawing.height >= 1.0f)) {
     return;
   }
+  const Plugin::gl::PassStateGuard stateGuard;
   const bool hasPrimary = waveforms.primary.texture != nullptr;
   const bool hasComparison = waveforms.comparison.texture != nullptr;
-  const int32_t type =
-      host.call(&HostEffectRecord::getInt, ParamId::kScopeComparisonType, kLayoutTime);
-  const bool show = hasComparison && host.call(&HostEffectRecord::getBool, ParamId::kShowComparison,
-                                               kLayoutTime) != 0;
-  const ScopeLayout layout = decideLayout(hasPrimary, hasComparison, type, show);
+  const CompositionSettings& settings = drawing.composition;
+  const ScopeLayout layout =
+      decideLayout(hasPrimary, hasComparison, settings.comparison.type,
+                   hasComparison && settings.comparison.showComparison);
 
   // The range and margins follow the waveform shown first.
   const WaveformResult* reference = layout.drawPrimary      ? &waveforms.primary
                                     : layout.drawComparison ? &waveforms.comparison
                                                             : nullptr;
   const bool extended = reference != nullptr && isExtended(*reference);
-  const float margin = verticalMargin(extended, drawing.labelScaleY);
+  const float margin = verticalMargin(extended, drawing.labels.scaleY);
   const float drawingHeight = drawing.height - 2.0f * margin;
   const float top = std::ceil(drawingHeight) + margin;
   const Plugin::gl::Matrix4 projection =
@@ -136,7 +127,7 @@ void drawScope(const HostCalls& host, Plugin::gl::EffectData& programs,
   glClear(GL_COLOR_BUFFER_BIT);
   glClearColor(0, 0, 0, 0);
 
-  const float labelSize = 10.0f * drawing.labelScaleY;
+  const float labelSize = 10.0f * drawing.labels.scaleY;
   const GuidelineList guidelines = buildGuidelines(extended, labelSize, drawingHeight);
   // The label column stays empty until the scope draws its IRE labels.
   const float labelColumn = 0.0f;
@@ -149,15 +140,14 @@ void drawScope(const HostCalls& host, Plugin::gl::EffectData& programs,
     fillWaveformPanel(host, programs, panel, kPanelBlack, projection, Plugin::gl::kIdentityMatrix);
   }
   const std::vector<PanelPart> parts = panelParts(layout, waveforms, panel);
-  drawWaveforms(host, programs, layout, parts, projection);
+  drawWaveforms(host, programs, settings, layout, parts, projection);
 
   const GraticuleFrame frame = {projection, Plugin::gl::kIdentityMatrix, -margin, top};
   if (drawing.showGuidelines) {
     drawGuidelines(host, programs, guidelines, labelColumn, drawing.width, frame);
   }
-  if (drawing.showColourBars &&
-      host.call(&HostEffectRecord::getInt, ParamId::kWaveformMode, kLayoutTime) == kModeLuminance) {
-    drawMarkers(host, programs, layout, parts, drawingHeight, frame);
+  if (drawing.showColourBars && settings.mode == kModeLuminance) {
+    drawMarkers(host, programs, settings.colorSpace, layout, parts, drawingHeight, frame);
   }
 }
 

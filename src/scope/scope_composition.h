@@ -7,22 +7,21 @@
 #include <array>
 
 #include "gl/effect_data.h"
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
+#include "scope/scope_settings.h"
 #include "scope/waveform_result.h"
 
 namespace plugin::Scopes {
 
 struct ScopeDrawing {
+  CompositionSettings composition;
   std::array<float, 4> background{};  // red, green, blue and alpha, not premultiplied
   bool showGuidelines = false;
-  bool showAxisLabels = false;
   bool showColourBars = false;
+  LabelSettings labels;
   float width = 0;  // the scope area, in pixels of the bound target
   float height = 0;
-  float labelScaleX = 1;
-  float labelScaleY = 1;
-  bool fillPanel = false;        // the control: the waveform panel is opaque black
-  bool interfaceThread = false;  // labels in the interface thread's text state
+  bool fillPanel = false;  // the control: the waveform panel is opaque black
 };
 
 // The empty rows kept above and below the waveform of an eight-bit layer, where the outermost
@@ -31,8 +30,8 @@ struct ScopeDrawing {
 float verticalMargin(bool extended, float labelScaleY);
 
 // Draws the scope over (0, 0)..(width, height) of the bound target, whose viewport the caller
-// set. The layout choices are read at time 0. Fences of the waveform textures are the caller's.
-void drawScope(const Plugin::gl::HostCalls& host, Plugin::gl::EffectData& programs,
+// set. Fences of the waveform textures are the caller's.
+void drawScope(const Plugin::host::HostCalls& host, Plugin::gl::EffectData& programs,
                const ScopeWaveforms& waveforms, const ScopeDrawing& drawing);
 
 }  // namespace plugin::Scopes

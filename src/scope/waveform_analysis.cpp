@@ -5,22 +5,21 @@
 #include <cstdio>
 #include <vector>
 
-#include "gl/host_textures.h"
-#include "gl/plugin_exception.h"
+#include "gl/texture_units.h"
+#include "gl/pass_state_guard.h"
 #include "gl/stencil_buffer.h"
 #include "gl/textured_quad_program.h"
 #include "gl/vertex_attributes.h"
 #include "gl/vertex_buffer.h"
 #include "scope/colour_space.h"
 #include "scope/parameter_choices.h"
-#include "scope/parameter_ids.h"
 #include "scope/waveform_analysis_shaders.h"
 
 namespace plugin::Scopes {
 namespace {
 
 using Plugin::gl::EffectData;
-using Plugin::gl::HostCalls;
+using Plugin::host::HostCalls;
 using vtpl::HostEffectRecord;
 namespace shader = AnalysisShader;
 
@@ -102,15 +101,14 @@ struct Grid {
   float sx = 1, sy = 1;
 };
 
-Grid samplingGrid(const HostCalls& host, const AnalysisInput& input, float factor) {
+Grid samplingGrid(const AnalysisSettings& settings, const AnalysisInput& input, float factor) {
   const float halfWidth = input.frameWidth / 2.0f;
   const float halfHeight = input.frameHeight / 2.0f;
-  float start[2] = {-halfWidth, -halfHeight};
-  float end[2] = {halfWidth, halfHeight};
+  FramePoint start = {-halfWidth, -halfHeight};
+  FramePoint end = {halfWidth, halfHeight};
   if (!input.fullFrame) {
-    host.call(&HostEffectRecord::getPoint, ParamId::kClipStartPos, input.time, &start[0],
-              &start[1]);
-    host.call(&HostEffectRecord::getPoint, ParamId::kClipEndPos, input.time, &end[0], &end[1]);
+    start = settings.clipStart;
+    end = settings.clipEnd;
   }
   Grid grid;
   grid.sx = input.renderScaleX * input.layerScale[0] * factor;
@@ -131,6 +129,108 @@ Grid samplingGrid(const HostCalls& host, const AnalysisInput& input, float facto
   return grid;
 }
 
+// How the points of one analysis are drawn: where, how bright, and how many may pile up.
+struct PointPlan {
+  Grid grid;
+  float intensity = 0;
+  GLint stencilReference = 0;
+  bool eightBitLayer = false;
+};
+
+PointPlan planPoints(const AnalysisSettings& settings, const AnalysisInput& input) {
+  const float factor = samplingFactor(settings.downsample);
+  PointPlan plan;
+  plan.grid = samplingGrid(settings, input, factor);
+  plan.eightBitLayer = input.layer.format == kEightBitFormat;
+  plan.intensity =
+      pointIntensity(settings.brightness, static_cast<float>(input.target->height()),
+                     plan.eightBitLayer, static_cast<float>(input.layer.height));
+  const int32_t cap = saturationCap(plan.intensity);
+  plan.stencilReference = std::min(writesAllChannels(settings.mode) ? 3 * cap : cap, 255);
+  return plan;
+}
+
+// The waveform texture as colour target, with a stencil buffer of its size from the pool to
+// count points per pixel.
+std::shared_ptr<Plugin::gl::StencilRenderBuffer> attachTargets(const AnalysisResources& resources,
+                                                               const Plugin::gl::Texture& target) {
+  glFramebufferTexture2D(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D, target.name(), 0);
+  glViewport(0, 0, static_cast<GLsizei>(target.width()), static_cast<GLsizei>(target.height()));
+  std::shared_ptr<Plugin::gl::StencilRenderBuffer> stencil =
+      Plugin::gl::acquireStencilBuffer(resources.stencilPool, resources.resourceLock);
+  Plugin::gl::attachStencil(*stencil, target.width(), target.height());
+  return stencil;
+}
+
+void setAnalysisUniforms(const EffectData& programs, const AnalysisSettings& settings,
+                         const AnalysisInput& input, const PointPlan& plan) {
+  const auto location = [&programs](const char* name) { return programs.uniformLocation(name); };
+  programs.setUniformMatrix(location(Plugin::gl::kProjectionUniform), 4, 1, false,
+                            input.projection);
+  programs.setUniformMatrix(location(Plugin::gl::kModelViewUniform), 4, 1, false, input.modelView);
+  Plugin::gl::bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, input.layer.name, false);
+  Plugin::gl::resetTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, true);
+  programs.setUniform1i(location(shader::kLayerSampler), 0);
+  programs.setUniform2f(location(shader::kFrameSize), static_cast<float>(input.frameWidth),
+                        static_cast<float>(input.frameHeight));
+  programs.setUniform2f(location(shader::kLayerExtent), input.layer.uMax, input.layer.vMax);
+  programs.setUniform1f(location(shader::kDirection), settings.directionDegrees * kDegreesToRadians);
+  programs.setUniform2i(location(shader::kGridOrigin), plan.grid.x0, plan.grid.y0);
+  programs.setUniform2f(location(shader::kSamplingScale), plan.grid.sx, plan.grid.sy);
+  programs.setUniform1f(location(shader::kIntensity), plan.intensity);
+  programs.setUniform2f(location(shader::kValueRange), plan.eightBitLayer ? 0.0f : -0.25f,
+                        plan.eightBitLayer ? 1.0f : 1.25f);
+  programs.setUniform1i(location(shader::kColorSpace), settings.colorSpace);
+  programs.setUniform1i(location(shader::kLinearInput), input.linearInput ? 1 : 0);
+}
+
+// Colour adds up, alpha keeps its largest value; the stencil counts points per pixel, and a
+// pixel stops taking points once the count reaches the plan's reference.
+void drawChannelPasses(const AnalysisResources& resources, int32_t mode, const PointPlan& plan) {
+  const EffectData& programs = resources.programs;
+  const GLint channelIndex = programs.uniformLocation(shader::kChannelIndex);
+  const GLint gridOrigin = programs.uniformLocation(shader::kGridOrigin);
+  glEnable(GL_BLEND);
+  glBlendEquationSeparate(GL_FUNC_ADD, GL_MAX);
+  glBlendFunc(GL_ONE, GL_ONE);
+  glEnable(GL_STENCIL_TEST);
+  glStencilOp(GL_KEEP, GL_INCR, GL_INCR);
+  glClear(GL_COLOR_BUFFER_BIT | GL_STENCIL_BUFFER_BIT);
+  const Grid& grid = plan.grid;
+  for (const Pass& pass : passesFor(mode)) {
+    glClear(GL_STENCIL_BUFFER_BIT);
+    programs.setUniform1i(channelIndex, pass.channelIndex);
+    glColorMask(pass.red, pass.green, pass.blue, GL_TRUE);
+    glStencilFunc(GL_GEQUAL, plan.stencilReference, 0xFF);
+    if (grid.rows <= 0 || grid.columns <= 0) {
+      continue;
+    }
+    if (resources.instancedDrawing) {
+      glDrawArraysInstanced(GL_POINTS, 0, grid.rows, grid.columns);
+    } else {
+      for (GLsizei column = 0; column < grid.columns; ++column) {
+        programs.setUniform2i(gridOrigin, grid.x0 + column, grid.y0);
+        glDrawArrays(GL_POINTS, 0, grid.rows);
+      }
+    }
+  }
+}
+
+// The state the host and the next pass expect: blending and the stencil test off, all channels
+// written, no program, no stencil attachment and nothing bound on unit 0.
+void finishAnalysis(const EffectData& programs) {
+  glColorMask(GL_TRUE, GL_TRUE, GL_TRUE, GL_TRUE);
+  glBlendEquation(GL_FUNC_ADD);
+  glDisable(GL_BLEND);
+  glDisable(GL_STENCIL_TEST);
+  glFlush();
+  glPointSize(1.0f);
+  Plugin::gl::unbindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, false);
+  programs.releaseProgram();
+  glFramebufferRenderbuffer(GL_FRAMEBUFFER, GL_STENCIL_ATTACHMENT, GL_RENDERBUFFER, 0);
+  glDisableVertexAttribArray(Plugin::gl::kPositionLocation);
+}
+
 }  // namespace
 
 const std::string& analysisVertexSource() {
@@ -144,10 +244,9 @@ void ensureAnalysisPrograms(EffectData& programs, bool echo) {
       continue;
     }
     programs.addProgram(analysisVertexSource(), shader::kFragmentSource, echo, name);
+    // The vertex stage takes its grid row, not a position, at location 0.
     programs.bindAttribute(name, Plugin::gl::kPositionLocation, shader::kRowAttribute);
-    if (!programs.linkProgram(name, echo)) {
-      throw Plugin::gl::PluginException(Plugin::gl::kUnableToLinkShaderText);
-    }
+    programs.linkProgram(name, echo);
   }
 }
 
@@ -166,108 +265,27 @@ int32_t saturationCap(float intensity) {
 }
 
 void analyseLayer(const HostCalls& host, const AnalysisResources& resources,
-                  const AnalysisInput& input) {
-  EffectData& programs = resources.programs;
-  const Plugin::gl::Texture& target = *input.target;
-  // 1. Parameters at the given time.
-  const int32_t mode = host.call(&HostEffectRecord::getInt, ParamId::kWaveformMode, input.time);
-  const float direction =
-      host.call(&HostEffectRecord::getAngle, ParamId::kWaveformDirection, input.time) *
-      kDegreesToRadians;
-  const int32_t downsample =
-      host.call(&HostEffectRecord::getInt, ParamId::kAnalysisDownsample, input.time);
-  const int32_t colorSpace = host.call(&HostEffectRecord::getInt, ParamId::kColorSpace, input.time);
-  const float brightness =
-      host.call(&HostEffectRecord::getFloat, ParamId::kWaveformBrightness, input.time);
-
-  // 2-5. Sampling grid, point size, intensity and cap.
-  const float factor = samplingFactor(downsample);
+                  const AnalysisSettings& settings, const AnalysisInput& input) {
+  const Plugin::gl::PassStateGuard stateGuard;
+  const PointPlan plan = planPoints(settings, input);
+  const float factor = samplingFactor(settings.downsample);
   if (factor < 1.0f) {
     glPointSize(1.0f / factor);
   }
-  const bool eightBitLayer = input.layer.format == kEightBitFormat;
-  const float intensity = pointIntensity(brightness, static_cast<float>(target.height()),
-                                         eightBitLayer, static_cast<float>(input.layer.height));
-  const int32_t cap = saturationCap(intensity);
-  const Grid grid = samplingGrid(host, input, factor);
+  const auto stencil = attachTargets(resources, *input.target);
+  resources.programs.useProgram(input.interfaceProgram ? kWaveformUIProgram : kWaveformProgram);
+  setAnalysisUniforms(resources.programs, settings, input, plan);
 
-  // 6. Target and stencil.
-  glFramebufferTexture2D(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D, target.name(), 0);
-  glViewport(0, 0, static_cast<GLsizei>(target.width()), static_cast<GLsizei>(target.height()));
-  std::shared_ptr<Plugin::gl::StencilRenderBuffer> stencil =
-      Plugin::gl::acquireStencilBuffer(resources.stencilPool, resources.resourceLock);
-  Plugin::gl::attachStencil(*stencil, target.width(), target.height());
-
-  // 7. Program and uniforms.
-  const char* program = input.interfaceProgram ? kWaveformUIProgram : kWaveformProgram;
-  programs.useProgram(program);
-  const auto location = [&programs](const char* name) { return programs.uniformLocation(name); };
-  programs.setUniformMatrix(location(Plugin::gl::kProjectionUniform), 4, 1, false,
-                            input.projection);
-  programs.setUniformMatrix(location(Plugin::gl::kModelViewUniform), 4, 1, false, input.modelView);
-  Plugin::gl::bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, input.layer.name, false);
-  Plugin::gl::resetTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, true);
-  programs.setUniform1i(location(shader::kLayerSampler), 0);
-  programs.setUniform2f(location(shader::kFrameSize), static_cast<float>(input.frameWidth),
-                        static_cast<float>(input.frameHeight));
-  programs.setUniform2f(location(shader::kLayerExtent), input.layer.uMax, input.layer.vMax);
-  programs.setUniform1f(location(shader::kDirection), direction);
-  programs.setUniform2i(location(shader::kGridOrigin), grid.x0, grid.y0);
-  programs.setUniform2f(location(shader::kSamplingScale), grid.sx, grid.sy);
-  programs.setUniform1f(location(shader::kIntensity), intensity);
-  programs.setUniform2f(location(shader::kValueRange), eightBitLayer ? 0.0f : -0.25f,
-                        eightBitLayer ? 1.0f : 1.25f);
-  programs.setUniform1i(location(shader::kColorSpace), colorSpace);
-  programs.setUniform1i(location(shader::kLinearInput), input.linearInput ? 1 : 0);
-
-  // 8. One vertex per grid row; the values only feed a negligible depth offset.
+  // One vertex per grid row; the values only feed a negligible depth offset.
   glBindVertexArray(host.call(&HostEffectRecord::vertexArray));
-  const std::vector<int8_t> rowOffsets(static_cast<size_t>(std::max(grid.rows, 1)), 0);
+  const std::vector<int8_t> rowOffsets(static_cast<size_t>(std::max(plan.grid.rows, 1)), 0);
   {
     const Plugin::gl::VertexBufferObjectRAII rowBuffer(
         host, rowOffsets.data(), static_cast<GLuint>(rowOffsets.size()), GL_STATIC_DRAW);
     glEnableVertexAttribArray(Plugin::gl::kPositionLocation);
     glVertexAttribPointer(Plugin::gl::kPositionLocation, 1, GL_BYTE, GL_FALSE, 0, nullptr);
-
-    // 9-10. Colour adds up, alpha keeps its largest value; the stencil counts points per pixel.
-    glEnable(GL_BLEND);
-    glBlendEquationSeparate(GL_FUNC_ADD, GL_MAX);
-    glBlendFunc(GL_ONE, GL_ONE);
-    glEnable(GL_STENCIL_TEST);
-    glStencilOp(GL_KEEP, GL_INCR, GL_INCR);
-    glClear(GL_COLOR_BUFFER_BIT | GL_STENCIL_BUFFER_BIT);
-    const GLint reference = std::min(writesAllChannels(mode) ? 3 * cap : cap, 255);
-
-    // 11-12. One pass per channel.
-    for (const Pass& pass : passesFor(mode)) {
-      glClear(GL_STENCIL_BUFFER_BIT);
-      programs.setUniform1i(location(shader::kChannelIndex), pass.channelIndex);
-      glColorMask(pass.red, pass.green, pass.blue, GL_TRUE);
-      glStencilFunc(GL_GEQUAL, reference, 0xFF);
-      if (grid.rows <= 0 || grid.columns <= 0) {
-        continue;
-      }
-      if (resources.instancedDrawing) {
-        glDrawArraysInstanced(GL_POINTS, 0, grid.rows, grid.columns);
-      } else {
-        for (GLsizei column = 0; column < grid.columns; ++column) {
-          programs.setUniform2i(location(shader::kGridOrigin), grid.x0 + column, grid.y0);
-          glDrawArrays(GL_POINTS, 0, grid.rows);
-        }
-      }
-    }
-
-    // 13. Restore.
-    glColorMask(GL_TRUE, GL_TRUE, GL_TRUE, GL_TRUE);
-    glBlendEquation(GL_FUNC_ADD);
-    glDisable(GL_BLEND);
-    glDisable(GL_STENCIL_TEST);
-    glFlush();
-    glPointSize(1.0f);
-    Plugin::gl::unbindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, false);
-    programs.releaseProgram();
-    glFramebufferRenderbuffer(GL_FRAMEBUFFER, GL_STENCIL_ATTACHMENT, GL_RENDERBUFFER, 0);
-    glDisableVertexAttribArray(Plugin::gl::kPositionLocation);
+    drawChannelPasses(resources, settings.mode, plan);
+    finishAnalysis(resources.programs);
   }
   glBindVertexArray(0);
 }

@@ -7,9 +7,10 @@
 #include <string>
 
 #include "gl/effect_data.h"
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 #include "gl/resource_types.h"
 #include "gl/texture.h"
+#include "scope/scope_settings.h"
 #include "vtpl/host_interface.h"
 
 namespace plugin::Scopes {
@@ -29,7 +30,6 @@ struct AnalysisInput {
   vtpl::HostTexture layer;
   std::shared_ptr<Plugin::gl::Texture> target;  // defined by the caller (waveformTextureHeight)
   bool fullFrame = false;                       // analyse the whole frame, ignoring the clip points
-  int32_t time = 0;
   int32_t frameWidth = 0;
   int32_t frameHeight = 0;
   float layerScale[2] = {1.0f, 1.0f};  // layer texture size over frame size, per axis
@@ -43,8 +43,8 @@ struct AnalysisInput {
 
 // The vertex stage of the analysis programs.
 const std::string& analysisVertexSource();
-// Builds "Waveform" and "WaveformUI" when missing; a link failure raises PluginException
-// "Unable to link shader".
+// Builds "Waveform" and "WaveformUI" when missing; a build failure throws
+// QvGLSLexception with the driver's log.
 void ensureAnalysisPrograms(Plugin::gl::EffectData& programs, bool echo);
 
 // Rows of the waveform texture: 256 for eight-bit output, else max(reference height, 256).
@@ -54,9 +54,10 @@ uint32_t waveformTextureHeight(uint32_t outputFormat, uint32_t referenceHeight);
 float pointIntensity(float brightness, float waveformHeight, bool eightBitLayer, float layerHeight);
 int32_t saturationCap(float intensity);
 
-// Runs the pass into the bound framebuffer. Parameters are read through the host at the time.
-void analyseLayer(const Plugin::gl::HostCalls& host, const AnalysisResources& resources,
-                  const AnalysisInput& input);
+// Runs the pass into the bound framebuffer. A pass left by an exception puts the GL state back
+// as it found it.
+void analyseLayer(const Plugin::host::HostCalls& host, const AnalysisResources& resources,
+                  const AnalysisSettings& settings, const AnalysisInput& input);
 
 }  // namespace plugin::Scopes
 

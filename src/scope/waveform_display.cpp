@@ -2,9 +2,9 @@
 
 #include <cstdio>
 
-#include "gl/plugin_exception.h"
 #include "gl/textured_quad_program.h"
 #include "gl/vertex_buffer.h"
+#include "gl/texture_units.h"
 #include "scope/colour_space.h"
 #include "scope/parameter_choices.h"
 
@@ -123,17 +123,6 @@ void setMatrices(EffectData& programs, const Plugin::gl::Matrix4& projection,
                             modelView.data());
 }
 
-void createQuadProgram(EffectData& programs, const std::string& fragmentSource, bool echo,
-                       const char* name) {
-  if (programs.programId(name) >= 0) {
-    return;
-  }
-  if (programs.createProgram(Plugin::gl::kTexturedQuadVertexSource, fragmentSource, echo, name,
-                             true, true) != vtpl::kResultHandled) {
-    throw Plugin::gl::PluginException(Plugin::gl::kUnableToLinkShaderText);
-  }
-}
-
 }  // namespace
 
 const std::string& waveformDisplayFragmentSource() {
@@ -142,11 +131,16 @@ const std::string& waveformDisplayFragmentSource() {
 }
 
 void ensureWaveformDisplayPrograms(EffectData& programs, bool echo) {
-  createQuadProgram(programs, waveformDisplayFragmentSource(), echo, kCopyWaveformProgram);
-  createQuadProgram(programs, kFillFragmentSource, echo, kFillWaveformBackgroundProgram);
+  const Plugin::gl::ProgramOptions options{echo, Plugin::gl::AttributeNames::kStored,
+                                           Plugin::gl::TexCoords::kOne};
+  programs.ensureProgram(kCopyWaveformProgram,
+                         {Plugin::gl::kTexturedQuadVertexSource, {}, waveformDisplayFragmentSource()},
+                         options);
+  programs.ensureProgram(kFillWaveformBackgroundProgram,
+                         {Plugin::gl::kTexturedQuadVertexSource, {}, kFillFragmentSource}, options);
 }
 
-void drawWaveformDisplay(const Plugin::gl::HostCalls& host, EffectData& programs,
+void drawWaveformDisplay(const Plugin::host::HostCalls& host, EffectData& programs,
                          GLuint waveformTexture, const Rectangle& destination,
                          DisplayIndex displayIndex, const Plugin::gl::Matrix4& projection,
                          const Plugin::gl::Matrix4& modelView) {
@@ -162,7 +156,7 @@ void drawWaveformDisplay(const Plugin::gl::HostCalls& host, EffectData& programs
   programs.releaseProgram();
 }
 
-void fillWaveformPanel(const Plugin::gl::HostCalls& host, EffectData& programs,
+void fillWaveformPanel(const Plugin::host::HostCalls& host, EffectData& programs,
                        const Rectangle& destination, const std::array<float, 4>& colour,
                        const Plugin::gl::Matrix4& projection,
                        const Plugin::gl::Matrix4& modelView) {

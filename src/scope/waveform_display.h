@@ -7,8 +7,8 @@
 #include <string>
 
 #include "gl/effect_data.h"
-#include "gl/host_calls.h"
-#include "gl/host_textures.h"
+#include "host_access/host_calls.h"
+#include "gl/quad_maths.h"
 #include "scope/channel_modes.h"
 
 namespace plugin::Scopes {
@@ -19,8 +19,8 @@ inline constexpr char kFillWaveformBackgroundProgram[] = "fillWaveformBackground
 // The fragment stage of "copyWaveform", with the Rec. 2020 conversions of its tinted traces.
 const std::string& waveformDisplayFragmentSource();
 
-// Builds whichever of the two programs the registry lacks; a link failure raises
-// PluginException "Unable to link shader".
+// Builds whichever of the two programs the registry lacks; a build failure throws
+// QvGLSLexception with the driver's log.
 void ensureWaveformDisplayPrograms(Plugin::gl::EffectData& programs, bool echo);
 
 struct Rectangle {
@@ -29,14 +29,14 @@ struct Rectangle {
 
 // Draws the whole waveform texture over `destination` with the display index's colours, into the
 // bound framebuffer. Blending is the caller's.
-void drawWaveformDisplay(const Plugin::gl::HostCalls& host, Plugin::gl::EffectData& programs,
+void drawWaveformDisplay(const Plugin::host::HostCalls& host, Plugin::gl::EffectData& programs,
                          GLuint waveformTexture, const Rectangle& destination,
                          DisplayIndex displayIndex, const Plugin::gl::Matrix4& projection,
                          const Plugin::gl::Matrix4& modelView);
 
 // Fills `destination` with one premultiplied colour through "fillWaveformBackground", into the
 // bound framebuffer. Blending is the caller's.
-void fillWaveformPanel(const Plugin::gl::HostCalls& host, Plugin::gl::EffectData& programs,
+void fillWaveformPanel(const Plugin::host::HostCalls& host, Plugin::gl::EffectData& programs,
                        const Rectangle& destination, const std::array<float, 4>& colour,
                        const Plugin::gl::Matrix4& projection, const Plugin::gl::Matrix4& modelView);
 

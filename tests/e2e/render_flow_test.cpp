@@ -2,6 +2,7 @@
 // the scope control analyses a frame itself, seen through the host's callbacks.
 #include <gtest/gtest.h>
 
+#include <sstream>
 #include <string>
 
 #include "waveform_module.h"
@@ -25,15 +26,39 @@ Image greyPicture() {
   return picture;
 }
 
-std::unique_ptr<EffectHost> openGlHost() {
-  vtpl::host::HostSettings settings = declaredStateSettings();
-  settings.gl = true;
-  return openHost(settings);
+// A GL host whose trace the test reads.
+struct TraceHolder {
+  std::ostringstream traceText;
+};
+class TracedHost : private TraceHolder, public EffectHost {
+ public:
+  TracedHost() : EffectHost(waveformModule(), glSettings(), &traceText) { open(); }
+  // Only an analysis asks for a static-draw buffer (one vertex per grid row).
+  int analyses() const {
+    const std::string text = traceText.str();
+    int count = 0;
+    for (size_t at = text.find(kAnalysisBuffer); at != std::string::npos;
+         at = text.find(kAnalysisBuffer, at + 1)) {
+      ++count;
+    }
+    return count;
+  }
+
+ private:
+  static constexpr char kAnalysisBuffer[] = "bytes, 0x88E4)";  // GL_STATIC_DRAW
+  static vtpl::host::HostSettings glSettings() {
+    vtpl::host::HostSettings settings = declaredStateSettings();
+    settings.gl = true;
+    return settings;
+  }
+};
+
+std::unique_ptr<TracedHost> openGlHost() {
+  return std::make_unique<TracedHost>();
 }
 
-// Only the analysis reads the direction, so its reads count analyses.
-int analyses(const EffectHost& host) {
-  return host.callbackCount("getAngle");
+int analyses(const TracedHost& host) {
+  return host.analyses();
 }
 int ownLayerFetches(const EffectHost& host) {
   return host.callbackCount("fetchOwnLayer");

@@ -61,7 +61,6 @@ TEST(CharacterOutlineTest, CopiesTheDescriptorAndSizesTheBandArrays) {
   EXPECT_EQ(outline->innerBandWidth, 0.5f);
   EXPECT_EQ(outline->outerBandWidth, 1.5f);
   EXPECT_EQ(outline->curves.size(), 2u);
-  EXPECT_FALSE(outline->triangulated);
   ASSERT_EQ(outline->contours.size(), 2u);
   for (size_t k = 0; k < 2; ++k) {
     const OutlineContour& contour = outline->contours[k];

@@ -10,7 +10,7 @@
 #include <vector>
 
 #include "gl/framebuffer.h"
-#include "gl/host_textures.h"
+#include "gl/quad_maths.h"
 #include "gl_test_context.h"
 #include "gl_test_host.h"
 #include "scope/blend_shader.h"

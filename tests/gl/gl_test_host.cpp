@@ -7,51 +7,11 @@ GlTestHost::GlTestHost() {
   record_.createBuffer = createBuffer;
   record_.releaseBuffer = releaseBuffer;
   record_.allocateTexture = allocateTexture;
-  record_.getInt = getInt;
-  record_.getFloat = getFloat;
-  record_.getAngle = getFloat;
-  record_.getPoint = getPoint;
-  record_.getBool = getBool;
-  record_.getColor = getColor;
   record_.releaseLayer = releaseLayer;
-}
-
-std::array<float, 2> GlTestHost::value(vtpl::HostContext context, const char* id) {
-  const auto& parameters = of(context).parameters;
-  const auto found = parameters.find(id);
-  return found != parameters.end() ? found->second : std::array<float, 2>{};
-}
-
-int32_t GlTestHost::getInt(vtpl::HostContext context, const char* id, int32_t) {
-  return static_cast<int32_t>(value(context, id)[0]);
-}
-
-uint8_t GlTestHost::getBool(vtpl::HostContext context, const char* id, int32_t) {
-  return value(context, id)[0] != 0 ? 1 : 0;
-}
-
-void GlTestHost::getColor(vtpl::HostContext context, const char* id, int32_t, float* red,
-                          float* green, float* blue) {
-  const auto& colours = of(context).colours;
-  const auto found = colours.find(id);
-  const std::array<float, 3> colour =
-      found != colours.end() ? found->second : std::array<float, 3>{};
-  *red = colour[0];
-  *green = colour[1];
-  *blue = colour[2];
 }
 
 void GlTestHost::releaseLayer(vtpl::HostContext context, const void*, uint32_t name) {
   of(context).releasedLayers.push_back(name);
-}
-
-float GlTestHost::getFloat(vtpl::HostContext context, const char* id, int32_t) {
-  return value(context, id)[0];
-}
-
-void GlTestHost::getPoint(vtpl::HostContext context, const char* id, int32_t, float* x, float* y) {
-  *x = value(context, id)[0];
-  *y = value(context, id)[1];
 }
 
 GlTestHost::~GlTestHost() {

@@ -1,16 +1,14 @@
-// A minimal host render interface for GL tests: the callbacks the GL layer uses, served with
-// real GL objects in the test's context, and a record of what was asked.
+// A minimal host render interface for GL tests: the callbacks the passes use (vertex array,
+// buffers, working textures and their release), served with real GL objects in the test's
+// context, and a record of what was asked.
 #ifndef WAVEFORM_TESTS_GL_GL_TEST_HOST_H
 #define WAVEFORM_TESTS_GL_GL_TEST_HOST_H
 
-#include <array>
 #include <cstdint>
-#include <map>
-#include <string>
 #include <vector>
 
 #include "gl/gl_api.h"
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 #include "vtpl/host_interface.h"
 
 namespace waveform_test {
@@ -25,16 +23,13 @@ class GlTestHost {
   GlTestHost();
   ~GlTestHost();
 
-  Plugin::gl::HostCalls calls() { return Plugin::gl::HostCalls(this, record_); }
+  Plugin::host::HostCalls calls() { return Plugin::host::HostCalls(this, record_); }
   vtpl::HostEffectRecord& record() { return record_; }
 
   // allocateTexture answers with storage of at least this size (0: exactly the request).
   uint32_t allocatedWidth = 0;
   uint32_t allocatedHeight = 0;
   std::vector<AllocationRequest> allocations;
-  // Parameter values by id for the get callbacks: a number, or a point's (x, y); colours apart.
-  std::map<std::string, std::array<float, 2>> parameters;
-  std::map<std::string, std::array<float, 3>> colours;
   std::vector<uint32_t> releasedLayers;  // texture names handed back with releaseLayer
   int buffersCreated = 0;
   int buffersReleased = 0;
@@ -45,14 +40,7 @@ class GlTestHost {
   static uint32_t createBuffer(vtpl::HostContext context, uint32_t target, uint32_t size,
                                const void* data, uint32_t usage, uint32_t* out, int32_t);
   static void releaseBuffer(vtpl::HostContext context, uint32_t name);
-  static std::array<float, 2> value(vtpl::HostContext context, const char* id);
-  static int32_t getInt(vtpl::HostContext context, const char* id, int32_t);
-  static uint8_t getBool(vtpl::HostContext context, const char* id, int32_t);
-  static void getColor(vtpl::HostContext context, const char* id, int32_t, float* red, float* green,
-                       float* blue);
   static void releaseLayer(vtpl::HostContext context, const void*, uint32_t name);
-  static float getFloat(vtpl::HostContext context, const char* id, int32_t);
-  static void getPoint(vtpl::HostContext context, const char* id, int32_t, float* x, float* y);
   static uint32_t allocateTexture(vtpl::HostContext context, const vtpl::HostRenderRecord*,
                                   uint32_t width, uint32_t height, uint32_t internalFormat,
                                   uint32_t format, uint32_t pixelType, uint32_t, uint32_t,

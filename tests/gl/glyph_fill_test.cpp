@@ -14,13 +14,13 @@
 
 #include "fonts/glyph_conversion.h"
 #include "geometry/character_outline.h"
-#include "geometry/triangulate_pieces.h"
 #include "gl/effect_data.h"
 #include "gl/framebuffer.h"
-#include "gl/host_textures.h"
+#include "gl/quad_maths.h"
 #include "gl/vertex_attributes.h"
 #include "gl_test_context.h"
 #include "gl_test_host.h"
+#include "text_render/glyph_fill.h"
 
 namespace waveform_test {
 namespace {
@@ -74,7 +74,8 @@ std::vector<uint8_t> fillOnGpu(FT_Face face, uint32_t glyph, const FT_Bitmap& bi
                                      static_cast<float>(top - height), static_cast<float>(top));
   programs.setUniformMatrix(programs.uniformLocation("projectionMatrix"), 4, 1, false,
                             projection.data());
-  qvtl::geometry::drawFill(*outline, host.calls());
+  Plugin::gl::drawFill(*outline, host.calls());
+  EXPECT_EQ(host.buffersReleased, host.buffersCreated);  // both host buffers go back
   programs.releaseProgram();
 
   // GL's first row is the bottom; FreeType's bitmap starts at the top.

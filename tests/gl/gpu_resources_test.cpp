@@ -6,7 +6,9 @@
 
 #include "gl/copy_pass.h"
 #include "gl/framebuffer.h"
-#include "gl/host_textures.h"
+#include "gl/quad_maths.h"
+#include "gl/texture_units.h"
+#include "host_access/working_texture.h"
 #include "gl/stencil_buffer.h"
 #include "gl/texture.h"
 #include "gl_test_context.h"
@@ -136,7 +138,9 @@ TEST_F(GpuResources, WorkingTextureRectangleAndFormat) {
   render.destination = &destination;
   host.record().messageRecord = &render;
 
-  const vtpl::HostTexture texture = acquireWorkingTexture(host.calls(), 1920, 1080, true, true);
+  const Plugin::host::LayerHandle handle =
+      Plugin::host::acquireWorkingTexture(host.calls(), 1920, 1080, true, true);
+  const vtpl::HostTexture& texture = handle.texture();
   EXPECT_EQ(texture.uMax, 0.9375f);
   EXPECT_EQ(texture.vMax, 0.52734375f);
   EXPECT_EQ(texture.allocatedWidth, 2048u);
@@ -148,9 +152,9 @@ TEST_F(GpuResources, WorkingTextureRectangleAndFormat) {
 
   // Without the float request, or from a template that is not RGBA, the format is kept.
   host.allocatedWidth = host.allocatedHeight = 0;
-  acquireWorkingTexture(host.calls(), 8, 8, false, false);
+  Plugin::host::acquireWorkingTexture(host.calls(), 8, 8, false, false);
   destination.format = GL_RGBA16F;
-  acquireWorkingTexture(host.calls(), 8, 8, true, false);
+  Plugin::host::acquireWorkingTexture(host.calls(), 8, 8, true, false);
   EXPECT_EQ(host.allocations[1].internalFormat, static_cast<uint32_t>(GL_RGBA));
   EXPECT_EQ(host.allocations[2].internalFormat, static_cast<uint32_t>(GL_RGBA16F));
 }

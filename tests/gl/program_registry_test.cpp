@@ -1,7 +1,8 @@
 // The program registry of EffectData, QvShader and QvGLSLexception on Mesa's software GL.
 #include <gtest/gtest.h>
 
-#include <memory>
+#include <algorithm>
+#include <iterator>
 #include <string>
 
 #include "gl/effect_data.h"
@@ -12,7 +13,9 @@ namespace waveform_test {
 namespace {
 
 using Plugin::gl::EffectData;
+using Plugin::gl::ProgramOptions;
 using Plugin::gl::QvGLSLexception;
+using Plugin::gl::TexCoords;
 
 const std::string kVertex = R"(#version 410
 in vec4 in_Position;
@@ -67,84 +70,74 @@ void main() { result = vec4(texCoordOut, 0.0, 1.0); })";
 
 class ProgramRegistry : public GlTest {};
 
+const ProgramOptions kPlainNames{false, Plugin::gl::AttributeNames::kPlain, TexCoords::kOne};
+
+void createPlain(EffectData& registry, const std::string& name,
+                 const std::string& fragment = kFragment) {
+  registry.createProgram(name, {kVertex, {}, fragment}, kPlainNames);
+}
+
 GLint attachedStageCount(GLuint program) {
   GLint count = 0;
   glGetProgramiv(program, GL_ATTACHED_SHADERS, &count);
   return count;
 }
 
-TEST_F(ProgramRegistry, CompileFailureThrowsAndRegistersNothing) {
-  EffectData registry;
-  try {
-    registry.addProgram(kBrokenVertex, kFragment, false, "broken");
-    FAIL() << "no exception";
-  } catch (const QvGLSLexception& error) {
-    EXPECT_EQ(error.errorType(), Plugin::gl::GLSLErrorType_ShaderCompile);
-    EXPECT_STREQ(error.what(), "GLSLErrorType_ShaderCompile - The Shader failed to compile.");
-  }
-  EXPECT_EQ(registry.programCount(), 0);
-  EXPECT_EQ(registry.programId("broken"), -1);
-}
-
-TEST_F(ProgramRegistry, LinkFailureThrowsAndKeepsTheProgramRegistered) {
-  EffectData registry;
-  try {
-    registry.createProgram(kVertex, kUnlinkableFragment, false, "unlinkable", false, true);
-    FAIL() << "no exception";
-  } catch (const QvGLSLexception& error) {
-    EXPECT_EQ(error.errorType(), Plugin::gl::GLSLErrorType_ShaderLink);
-    EXPECT_STREQ(error.what(), "GLSLErrorType_ShaderLink - The shader program failed to link.");
-  }
-  ASSERT_GE(registry.programId("unlinkable"), 0);
-  GLint linked = 1;
-  glGetProgramiv(static_cast<GLuint>(registry.programId("unlinkable")), GL_LINK_STATUS, &linked);
-  EXPECT_EQ(linked, 0);
-}
-
-TEST_F(ProgramRegistry, EchoedCompileFailurePrintsTheDriverLog) {
-  for (const bool echo : {true, false}) {
+// Both failures carry their fixed message and the driver's log, whatever the echo flag; only an
+// echoed build prints, and a link log is printed on its own.
+TEST_F(ProgramRegistry, BuildFailuresCarryTheDriverLog) {
+  for (const bool echo : {false, true}) {
     EffectData registry;
     testing::internal::CaptureStdout();
-    EXPECT_THROW(registry.addProgram(kBrokenVertex, kFragment, echo, "broken"), QvGLSLexception);
+    try {
+      registry.addProgram(kBrokenVertex, kFragment, echo, "broken");
+      ADD_FAILURE() << "no exception";
+    } catch (const QvGLSLexception& error) {
+      EXPECT_EQ(error.errorType(), Plugin::gl::GLSLErrorType_ShaderCompile);
+      EXPECT_STREQ(error.what(), "GLSLErrorType_ShaderCompile - The Shader failed to compile.");
+      EXPECT_NE(error.log().find("undeclaredValue"), std::string::npos) << error.log();
+    }
+    EXPECT_EQ(registry.programId("broken"), -1);  // nothing registered
+    try {
+      registry.createProgram("unlinkable", {kVertex, {}, kUnlinkableFragment},
+                             {echo, Plugin::gl::AttributeNames::kPlain, TexCoords::kOne});
+      ADD_FAILURE() << "no exception";
+    } catch (const QvGLSLexception& error) {
+      EXPECT_EQ(error.errorType(), Plugin::gl::GLSLErrorType_ShaderLink);
+      EXPECT_STREQ(error.what(), "GLSLErrorType_ShaderLink - The shader program failed to link.");
+      EXPECT_NE(error.log().find("definedNowhere"), std::string::npos) << error.log();
+    }
     const std::string printed = testing::internal::GetCapturedStdout();
     if (echo) {
       EXPECT_NE(printed.find("undeclaredValue"), std::string::npos) << printed;
+      const size_t link = printed.find("definedNowhere");
+      ASSERT_NE(link, std::string::npos) << printed;
     } else {
       EXPECT_EQ(printed, "");
     }
+    // A failed link keeps the program registered, unlinked.
+    GLint linked = 1;
+    glGetProgramiv(static_cast<GLuint>(registry.programId("unlinkable")), GL_LINK_STATUS, &linked);
+    EXPECT_EQ(linked, 0);
   }
-}
-
-TEST_F(ProgramRegistry, EchoedLinkFailurePrintsTheLinkLogOnItsOwn) {
-  EffectData registry;
-  testing::internal::CaptureStdout();
-  EXPECT_THROW(
-      registry.createProgram(kVertex, kUnlinkableFragment, true, "unlinkable", false, true),
-      QvGLSLexception);
-  const std::string printed = testing::internal::GetCapturedStdout();
-  EXPECT_NE(printed.find("definedNowhere"), std::string::npos) << printed;
-  EXPECT_NE(printed.front(), '\n') << "the link log was joined to a compile log";
 }
 
 TEST_F(ProgramRegistry, CreationIndexesStayWhileNamesSort) {
   EffectData registry;
   for (const char* name : {"gamma", "beta", "alpha"}) {
-    ASSERT_EQ(registry.createProgram(kVertex, kFragment, false, name, false, true), 1);
+    createPlain(registry, name);
   }
   const std::vector<std::pair<std::string, int32_t>> expected = {
       {"alpha", 2}, {"beta", 1}, {"gamma", 0}};
   EXPECT_EQ(registry.nameIndex(), expected);
-  const int32_t gamma = registry.programId("gamma");
-  const int32_t beta = registry.programId("beta");
-  const int32_t alpha = registry.programId("alpha");
-  for (const int32_t id : {gamma, beta, alpha}) {
-    EXPECT_TRUE(glIsProgram(static_cast<GLuint>(id)));
+  EXPECT_NE(registry.programId("gamma"), registry.programId("alpha"));
+  EXPECT_TRUE(glIsProgram(static_cast<GLuint>(registry.programId("alpha"))));
+  for (const char* unknown : {"alphabet", "alph", ""}) {
+    EXPECT_EQ(registry.programId(unknown), -1) << unknown;
   }
-  EXPECT_NE(gamma, beta);
-  EXPECT_NE(beta, alpha);
-  EXPECT_EQ(registry.programId("alphabet"), -1);
-  EXPECT_EQ(registry.programId("alph"), -1);
-  EXPECT_EQ(registry.programId(""), -1);
+  // ensureProgram builds nothing for a name the registry has.
+  registry.ensureProgram("beta", {kVertex, {}, kOtherFragment}, kPlainNames);
+  EXPECT_EQ(registry.programCount(), 3);
 }
 
 TEST_F(ProgramRegistry, GeometryStageOnlyWhenItsSourceIsGiven) {
@@ -159,9 +152,9 @@ TEST_F(ProgramRegistry, GeometryStageOnlyWhenItsSourceIsGiven) {
 
 TEST_F(ProgramRegistry, CreatingBindsTheFixedAttributeLocations) {
   EffectData registry;
-  ASSERT_EQ(registry.createProgram(kVertex, kFragment, false, "plain", false, true), 1);
-  ASSERT_EQ(
-      registry.createProgramTwoTexCoords(kTwoCoordVertex, kSumFragment, false, "stored", true), 1);
+  createPlain(registry, "plain");
+  registry.createProgram("stored", {kTwoCoordVertex, {}, kSumFragment},
+                         {false, Plugin::gl::AttributeNames::kStored, TexCoords::kTwo});
   const auto plain = static_cast<GLuint>(registry.programId("plain"));
   const auto stored = static_cast<GLuint>(registry.programId("stored"));
   EXPECT_EQ(glGetAttribLocation(plain, "in_Position"), 0);
@@ -173,8 +166,8 @@ TEST_F(ProgramRegistry, CreatingBindsTheFixedAttributeLocations) {
 
 TEST_F(ProgramRegistry, UniformLocationAsksTheCurrentOrElseTheFirstProgram) {
   EffectData registry;
-  ASSERT_EQ(registry.createProgram(kVertex, kFragment, false, "first", false, true), 1);
-  ASSERT_EQ(registry.createProgram(kVertex, kOtherFragment, false, "second", false, true), 1);
+  createPlain(registry, "first");
+  createPlain(registry, "second", kOtherFragment);
   registry.releaseProgram();
   EXPECT_GE(registry.uniformLocation("colour"), 0);
   EXPECT_EQ(registry.uniformLocation("tint"), -1);  // only the second program has it
@@ -187,7 +180,7 @@ TEST_F(ProgramRegistry, UniformLocationAsksTheCurrentOrElseTheFirstProgram) {
 
 TEST_F(ProgramRegistry, MatrixUniformsOnlyForDimensionsTwoToFour) {
   EffectData registry;
-  ASSERT_EQ(registry.createProgram(kVertex, kFragment, false, "program", false, true), 1);
+  createPlain(registry, "program");
   registry.useProgram("program");
   const GLint location = registry.uniformLocation("transform");
   ASSERT_GE(location, 0);
@@ -197,16 +190,12 @@ TEST_F(ProgramRegistry, MatrixUniformsOnlyForDimensionsTwoToFour) {
   }
   registry.setUniformMatrix(location, 4, 1, false, identity);
   float other[25];
-  for (float& value : other) {
-    value = 7.0f;
-  }
+  std::fill(std::begin(other), std::end(other), 7.0f);
   registry.setUniformMatrix(location, 1, 1, false, other);
   registry.setUniformMatrix(location, 5, 1, false, other);
   float readBack[16] = {};
   glGetUniformfv(static_cast<GLuint>(registry.programId("program")), location, readBack);
-  for (int i = 0; i < 16; ++i) {
-    EXPECT_EQ(readBack[i], identity[i]) << i;
-  }
+  EXPECT_TRUE(std::equal(std::begin(readBack), std::end(readBack), std::begin(identity)));
   registry.releaseProgram();
 }
 
@@ -214,7 +203,7 @@ TEST_F(ProgramRegistry, DestroyingTheRegistryDeletesItsPrograms) {
   GLuint program = 0;
   {
     EffectData registry;
-    ASSERT_EQ(registry.createProgram(kVertex, kFragment, false, "program", false, true), 1);
+    createPlain(registry, "program");
     program = static_cast<GLuint>(registry.programId("program"));
     ASSERT_TRUE(glIsProgram(program));
   }

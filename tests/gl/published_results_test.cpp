@@ -4,11 +4,12 @@
 #include <vector>
 
 #include "gl/framebuffer.h"
-#include "gl/host_textures.h"
+#include "gl/quad_maths.h"
 #include "gl_test_host.h"
 #include "gl_thread.h"
 #include "plugin/scopes_shared_data.h"
 #include "plugin/waveform_results.h"
+#include "scope/parameter_choices.h"
 #include "scope/waveform_analysis.h"
 
 namespace waveform_test {
@@ -49,7 +50,6 @@ TEST(PublishedResults, InterfaceThreadReadsWhatTheRenderThreadAnalysed) {
     layer.uMax = layer.vMax = 1.0f;
 
     GlTestHost host;
-    host.parameters = {{"waveformMode", {1, 0}}, {"waveformBrightness", {1, 0}}};
     Plugin::gl::EffectData programs;
     ensureAnalysisPrograms(programs, false);
     Plugin::gl::StencilBufferList pool;
@@ -67,7 +67,10 @@ TEST(PublishedResults, InterfaceThreadReadsWhatTheRenderThreadAnalysed) {
     const Plugin::gl::FBO framebuffer;
     glBindFramebuffer(GL_FRAMEBUFFER, framebuffer.name());
     glClearColor(0, 0, 0, 0);
-    analyseLayer(host.calls(), {programs, pool, lock, true}, input);
+    AnalysisSettings rgb;
+    rgb.mode = kModeRGB;
+    rgb.brightness = 1;
+    analyseLayer(host.calls(), {programs, pool, lock, true}, rgb, input);
     glBindFramebuffer(GL_FRAMEBUFFER, 0);
     storeResult(shared, &ScopesSharedData::primary, input.target, kWidth, kHeight);
     analysed = readTexture(*input.target);

@@ -7,6 +7,8 @@
 #include <vector>
 
 #include "gl/framebuffer.h"
+#include "gl/quad_maths.h"
+#include "gl/texture_units.h"
 #include "gl_test_context.h"
 #include "gl_test_host.h"
 #include "scope/blend_shader.h"
@@ -91,11 +93,12 @@ struct Rendered {
 Rendered render(const Placement& placement, int32_t blend, float backgroundAlpha,
                 const ScopeWaveforms& waveforms, uint32_t padTo = 0) {
   GlTestHost host;
-  host.parameters["scopePositionTL"] = placement.topLeft;
-  host.parameters["scopePositionBR"] = placement.bottomRight;
-  host.parameters["renderToLayerLabelScale"] = {1};
-  host.parameters["renderToLayerBackgroundAlpha"] = {backgroundAlpha};
-  host.colours["renderToLayerBackgroundColor"] = {0.2f, 0.3f, 0.4f};
+  RenderToLayerSettings settings;
+  settings.blend = blend;
+  settings.topLeft = placement.topLeft;
+  settings.bottomRight = placement.bottomRight;
+  settings.backgroundColour = {0.2f, 0.3f, 0.4f};
+  settings.backgroundAlpha = backgroundAlpha;
   host.allocatedWidth = padTo;
   host.allocatedHeight = padTo;
   const uint32_t allocated = padTo != 0 ? padTo : kFrameWidth;
@@ -121,7 +124,7 @@ Rendered render(const Placement& placement, int32_t blend, float backgroundAlpha
   ensureWaveformDisplayPrograms(programs, false);
   ensureGuidelineProgram(programs, false);
   ensureBlendProgram(programs, false);
-  renderToLayer(host.calls(), programs, waveforms, frame, blend);
+  renderToLayer(host.calls(), programs, waveforms, frame, settings, CompositionSettings{});
 
   Rendered rendered;
   rendered.pixels.resize(static_cast<size_t>(kFrameWidth) * kFrameHeight);

@@ -12,6 +12,7 @@
 #include "gl_test_host.h"
 #include "scope/blend_shader.h"
 #include "scope/graticule_drawing.h"
+#include "scope/parameter_choices.h"
 #include "scope/scope_composition.h"
 #include "scope/waveform_display.h"
 
@@ -108,11 +109,12 @@ TEST_F(ScopeComposition, OverlayRoutesEachScopeIntoItsChannels) {
   };
   for (const Case& c : cases) {
     GlTestHost host;
-    host.parameters["scopeComparisonType"] = {1};
-    host.parameters["overlayChannels"] = {static_cast<float>(c.channels)};
-    host.parameters["waveformMode"] = {1};  // RGB: grey traces when overlaid
+    ScopeDrawing drawing = blackScope(32, 16);
+    drawing.composition.comparison.type = kComparisonOverlay;
+    drawing.composition.overlayChannels = c.channels;
+    drawing.composition.mode = kModeRGB;  // grey traces when overlaid
     DrawnScope scope(32, 16);
-    scope.draw(host, waveforms, blackScope(32, 16));
+    scope.draw(host, waveforms, drawing);
     const std::string what = "channels " + std::to_string(c.channels);
     expectPixel(scope.at(4, 8), c.left, what + " left", 1e-4f);
     expectPixel(scope.at(27, 8), c.right, what + " right", 1e-4f);
@@ -137,15 +139,15 @@ TEST_F(ScopeComposition, SideBySideAndSingleScopeLayouts) {
   };
   for (const Case& c : cases) {
     GlTestHost host;
-    host.parameters["scopeComparisonType"] = {static_cast<float>(c.type)};
-    host.parameters["showComparison"] = {c.show ? 1.0f : 0.0f};
+    ScopeDrawing drawing = blackScope(40, 10);
+    drawing.composition.comparison = {c.type, c.show};
     ScopeWaveforms waveforms;
     waveforms.primary = primary;
     if (c.withComparison) {
       waveforms.comparison = comparison;
     }
     DrawnScope scope(40, 10);
-    scope.draw(host, waveforms, blackScope(40, 10));
+    scope.draw(host, waveforms, drawing);
     for (const int x : {0, 10, 19}) {
       expectPixel(scope.at(x, 5), {c.left, c.left, c.left, 1}, std::string(c.what) + " left");
     }
@@ -163,7 +165,7 @@ TEST_F(ScopeComposition, ControlPanelIsBlackBetweenTheMarginsOfAnEightBitScope) 
   drawing.background = {0.2f, 0.4f, 0.6f, 1};
   drawing.width = 20;
   drawing.height = 60;
-  drawing.labelScaleY = 1.5f;  // margins of 15 pixels
+  drawing.labels.scaleY = 1.5f;  // margins of 15 pixels
   drawing.fillPanel = true;
   DrawnScope scope(20, 60);
   scope.draw(host, waveforms, drawing);
@@ -249,10 +251,10 @@ TEST_F(ScopeComposition, ColourBarMarkersOnlyInLuminanceOncePerHalf) {
   };
   for (const Case& c : cases) {
     GlTestHost host;
-    host.parameters["waveformMode"] = {static_cast<float>(c.mode)};
-    host.parameters["scopeComparisonType"] = {static_cast<float>(c.type)};
-    host.parameters["colorSpace"] = {709};
     ScopeDrawing drawing = blackScope(90, 60);
+    drawing.composition.mode = c.mode;
+    drawing.composition.comparison.type = c.type;
+    drawing.composition.colorSpace = kRec709;
     drawing.showColourBars = true;
     DrawnScope scope(90, 60);
     scope.draw(host, waveforms, drawing);

@@ -8,7 +8,7 @@
 #include <vector>
 
 #include "gl/framebuffer.h"
-#include "gl/host_textures.h"
+#include "gl/quad_maths.h"
 #include "gl_test_context.h"
 #include "gl_test_host.h"
 #include "scope/waveform_analysis.h"
@@ -28,16 +28,14 @@ struct Frame {
   uint32_t layerFormat = kEightBit;
 };
 
-struct Settings {
-  int32_t mode = 0;
-  int32_t colorSpace = 709;
-  float brightness = 1.0f;
-  float directionDegrees = 0.0f;
-  int32_t downsample = 0;
+struct Settings : AnalysisSettings {
+  Settings() {
+    colorSpace = 709;
+    brightness = 1.0f;
+  }
   bool instanced = true;
   bool fullFrame = true;
   bool linearInput = false;
-  std::array<float, 2> clipStart{}, clipEnd{};
 };
 
 // A waveform read back: width x height RGBA floats, row 0 at the bottom.
@@ -83,13 +81,6 @@ Waveform analyse(const Frame& frame, const Settings& settings) {
   target->define(layer.width, rows, GL_RGBA32F, 1.0f);
 
   GlTestHost host;
-  host.parameters = {{"waveformMode", {float(settings.mode), 0}},
-                     {"colorSpace", {float(settings.colorSpace), 0}},
-                     {"waveformBrightness", {settings.brightness, 0}},
-                     {"waveformDirection", {settings.directionDegrees, 0}},
-                     {"analysisDownsample", {float(settings.downsample), 0}},
-                     {"clipStartPos", settings.clipStart},
-                     {"clipEndPos", settings.clipEnd}};
   Plugin::gl::EffectData programs;
   ensureAnalysisPrograms(programs, false);
   Plugin::gl::StencilBufferList pool;
@@ -109,7 +100,7 @@ Waveform analyse(const Frame& frame, const Settings& settings) {
   const Plugin::gl::FBO framebuffer;
   glBindFramebuffer(GL_FRAMEBUFFER, framebuffer.name());
   glClearColor(0, 0, 0, 0);
-  analyseLayer(host.calls(), {programs, pool, lock, settings.instanced}, input);
+  analyseLayer(host.calls(), {programs, pool, lock, settings.instanced}, settings, input);
 
   Waveform waveform;
   waveform.width = frame.width;

@@ -1,5 +1,5 @@
 // The effect's door to the host: refusals and empty slots become "Plugin Error".
-#include "gl/host_calls.h"
+#include "host_access/host_calls.h"
 
 #include <gtest/gtest.h>
 
@@ -7,8 +7,8 @@
 
 namespace {
 
-using Plugin::gl::HostCalls;
-using Plugin::gl::PluginException;
+using Plugin::host::HostCalls;
+using Plugin::host::PluginException;
 using vtpl::HostEffectRecord;
 
 int32_t refusingEndGroup(vtpl::HostContext) {

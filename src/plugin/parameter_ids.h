@@ -1,6 +1,6 @@
 // The ids of the effect's parameters: the only key by which values are read back from the host.
-#ifndef WAVEFORM_SCOPE_PARAMETER_IDS_H
-#define WAVEFORM_SCOPE_PARAMETER_IDS_H
+#ifndef WAVEFORM_PLUGIN_PARAMETER_IDS_H
+#define WAVEFORM_PLUGIN_PARAMETER_IDS_H
 
 namespace plugin::Scopes::ParamId {
 
@@ -32,4 +32,4 @@ inline constexpr char kRenderToLayerBackgroundAlpha[] = "renderToLayerBackground
 
 }  // namespace plugin::Scopes::ParamId
 
-#endif  // WAVEFORM_SCOPE_PARAMETER_IDS_H
+#endif  // WAVEFORM_PLUGIN_PARAMETER_IDS_H

@@ -1,8 +1,8 @@
-#include "scope/comparison_layer.h"
+#include "plugin/comparison_layer.h"
 
 #include <cstring>
 
-#include "scope/parameter_ids.h"
+#include "plugin/parameter_ids.h"
 
 namespace plugin::Scopes {
 namespace {
@@ -15,8 +15,9 @@ constexpr uint32_t kKindsWithPixels = 0xD3;
 
 }  // namespace
 
-vtpl::HostTexture fetchComparisonLayer(const Plugin::gl::HostCalls& host, int32_t time,
-                                       int32_t layerArgument, int32_t frameIndex) {
+Plugin::host::LayerHandle fetchComparisonLayer(const Plugin::host::HostCalls& host, int32_t time,
+                                               int32_t layerArgument, int32_t frameIndex,
+                                               const void* releaseRecord) {
   char identifier[vtpl::kIdentifierChars + 1] = {};
   void* layer = host.call(&HostEffectRecord::getLayer, ParamId::kOverlayLayer, time, layerArgument,
                           identifier);
@@ -36,7 +37,7 @@ vtpl::HostTexture fetchComparisonLayer(const Plugin::gl::HostCalls& host, int32_
       vtpl::kStatusOk) {
     return {};
   }
-  return texture;
+  return Plugin::host::LayerHandle(host, releaseRecord, texture);
 }
 
 }  // namespace plugin::Scopes

@@ -1,14 +1,14 @@
 // The effect's door to the host: the context handle and the record of the current Notify call,
 // and the checked way to call a slot of the record's callback table.
-#ifndef WAVEFORM_GL_HOST_CALLS_H
-#define WAVEFORM_GL_HOST_CALLS_H
+#ifndef WAVEFORM_HOST_ACCESS_HOST_CALLS_H
+#define WAVEFORM_HOST_ACCESS_HOST_CALLS_H
 
 #include <utility>
 
-#include "gl/plugin_exception.h"
+#include "host_access/plugin_exception.h"
 #include "vtpl/host_interface.h"
 
-namespace Plugin::gl {
+namespace Plugin::host {
 
 class HostCalls {
  public:
@@ -42,6 +42,6 @@ class HostCalls {
   vtpl::HostEffectRecord& record_;
 };
 
-}  // namespace Plugin::gl
+}  // namespace Plugin::host
 
-#endif  // WAVEFORM_GL_HOST_CALLS_H
+#endif  // WAVEFORM_HOST_ACCESS_HOST_CALLS_H

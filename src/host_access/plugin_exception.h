@@ -1,17 +1,15 @@
 // The effect's own failure: a standard exception carrying one of a few fixed texts. Notify turns
 // it into result 5.
-#ifndef WAVEFORM_GL_PLUGIN_EXCEPTION_H
-#define WAVEFORM_GL_PLUGIN_EXCEPTION_H
+#ifndef WAVEFORM_HOST_ACCESS_PLUGIN_EXCEPTION_H
+#define WAVEFORM_HOST_ACCESS_PLUGIN_EXCEPTION_H
 
 #include <exception>
 
-namespace Plugin::gl {
+namespace Plugin::host {
 
-// The fixed texts. The exception keeps only the pointer, so only texts with static lifetime may
+// The fixed text. The exception keeps only the pointer, so only texts with static lifetime may
 // be used.
 inline constexpr const char kPluginErrorText[] = "Plugin Error";
-inline constexpr const char kUnableToLinkShaderText[] = "Unable to link shader";
-inline constexpr const char kUnableToLinkClearShaderText[] = "Unable to link clear shader.";
 
 class PluginException : public std::exception {
  public:
@@ -22,6 +20,6 @@ class PluginException : public std::exception {
   const char* text_;
 };
 
-}  // namespace Plugin::gl
+}  // namespace Plugin::host
 
-#endif  // WAVEFORM_GL_PLUGIN_EXCEPTION_H
+#endif  // WAVEFORM_HOST_ACCESS_PLUGIN_EXCEPTION_H
