@@ -243,6 +243,7 @@ Image EffectHost::renderFrame(const Image& layer, bool asFloat, const FrameOptio
     output = readLayer(destination, layer.bitDepth);
     deleteLayerTexture(source);
     deleteLayerTexture(destination);
+    texturesReclaimed_ += workingTextures_.size();
     for (HostTexture& texture : workingTextures_) {
       deleteLayerTexture(texture);
     }

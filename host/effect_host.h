@@ -126,6 +126,9 @@ class EffectHost {
   ParameterStore& parameters() { return store_; }
   const HostSettings& settings() const { return settings_; }
   HostFaults& faults() { return faults_; }
+  // Textures lent to the effect (fetched layers, the own layer, working textures) that it did not
+  // hand back with releaseLayer: still lent now, or reclaimed by the host after a render.
+  size_t texturesNotHandedBack() const { return texturesReclaimed_ + workingTextures_.size(); }
   TraceLog& trace() { return trace_; }
 
   // What the callbacks saw.
@@ -170,6 +173,7 @@ class EffectHost {
   int callbackCount_ = 0;
   std::map<std::string, int, std::less<>> callbacksByName_;
   std::vector<HostTexture> workingTextures_;
+  size_t texturesReclaimed_ = 0;
   Image ownLayer_;  // the picture of the frame last rendered (frame index 0)
   Image controlPicture_;
   bool ownLayerIsFloat_ = false;

@@ -3,6 +3,7 @@
 
 #include <climits>
 
+#include "host_error.h"
 #include "waveform_module.h"
 
 namespace waveform_test {
@@ -89,6 +90,66 @@ TEST(Failures, EmptyCallbackSlotsAreReportedNotCalled) {
   declaring.record().defineChoice = nullptr;
   EXPECT_EQ(declareWith(declaring), 5);
   EXPECT_EQ(declaring.parameters().parameters().size(), 1u);
+}
+
+vtpl::host::Image greyPicture() {
+  vtpl::host::Image picture;
+  picture.width = 32;
+  picture.height = 16;
+  picture.rgba.assign(4 * 32 * 16, 0.5f);
+  return picture;
+}
+
+// Both flows with everything on: a comparison layer, an attached control, the scope rendered
+// into the layer; then a stale frame the control analyses itself on the interface thread.
+void renderAndDrawEverything(EffectHost& host) {
+  host.parameters().writeInt("blendType", 4);  // Screen
+  host.parameters().setFromText("scopePositionTL", "-16, 8");
+  host.parameters().setFromText("scopePositionBR", "16, -8");
+  host.setComparisonLayer(greyPicture())->info.frameCount = 2;
+  host.attachControl();
+  vtpl::host::FrameOptions second;
+  second.frameIndex = 1;
+  for (const bool attached : {true, false}) {
+    try {
+      host.renderFrame(greyPicture(), false, second);
+    } catch (const vtpl::host::HostError&) {
+      // The render answered 5; what it borrowed is counted by the caller.
+    }
+    // Then nothing attached and nothing blended: the results go stale.
+    host.send(attached ? vtpl::kMessageDetach : vtpl::kMessageAcknowledged);
+    host.parameters().writeInt("blendType", 0);
+  }
+  vtpl::host::ControlOptions first;
+  first.frameCount = 2;
+  host.drawControl(first);
+}
+
+// Whatever callback fails, every texture the host lent (a fetched layer, the own layer, a working
+// texture) and every buffer it created goes back to it.
+TEST(Failures, EveryFailingCallbackLeavesNothingBorrowed) {
+  const char* const callbacks[] = {
+      "progress",      "getInt",          "getBool",     "getFloat",     "getAngle",
+      "getPoint",      "getColor",        "getLayer",    "getLayerInfo", "fetchLayer",
+      "fetchOwnLayer", "allocateTexture", "vertexArray", "createBuffer", "releaseBuffer",
+      "releaseLayer",  "redrawControl",
+  };
+  for (const char* failing : callbacks) {
+    vtpl::host::HostSettings settings = declaredStateSettings();
+    settings.gl = true;
+    auto host = openHost(settings);
+    host->faults().throwInCallback = failing;
+    renderAndDrawEverything(*host);
+    EXPECT_GT(host->callbackCount(failing), 0) << failing << " was never called";
+    // The failing callback fails every time it is called: a host that refuses every texture back
+    // has still been offered each one.
+    const std::string name = failing;
+    EXPECT_EQ(host->texturesNotHandedBack(),
+              name == "releaseLayer" ? static_cast<size_t>(host->callbackCount(failing)) : 0u)
+        << "failing " << failing;
+    const int buffers = name == "createBuffer" ? 0 : host->callbackCount("createBuffer");
+    EXPECT_EQ(host->callbackCount("releaseBuffer"), buffers) << "failing " << failing;
+  }
 }
 
 TEST(Failures, NullRecordIsNotHandledAndCreatesNothing) {

@@ -186,7 +186,8 @@ TEST(Tool, PluginPathWithoutFolderIsTheFileInTheCurrentFolder) {
 }
 
 // Mesa can be told to offer GLSL 4.00 only: the effect's "#version 410" programs then fail to
-// compile, message 8 answers 5 through the module, and the driver's log is echoed when verbose.
+// compile and message 8 answers 5 through the module. The failure and the driver's log reach
+// standard error in any case; standard output echoes the log only when verbose.
 TEST(Tool, DriverWithoutGlsl410FailsSetUpWithAResult) {
   const std::string picture = testing::TempDir() + "/tool_glsl_in.png";
   vtpl::host::Image image;
@@ -205,6 +206,9 @@ TEST(Tool, DriverWithoutGlsl410FailsSetUpWithAResult) {
               std::string::npos)
         << run.err;
     EXPECT_EQ(run.out.find("error") != std::string::npos, verbose) << run.out;
+    const size_t failure = run.err.find("Waveform: GLSLErrorType_");
+    ASSERT_NE(failure, std::string::npos) << run.err;
+    EXPECT_NE(run.err.find("\nerror", failure), std::string::npos) << run.err;
   }
   std::remove(picture.c_str());
 }

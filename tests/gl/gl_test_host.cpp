@@ -1,5 +1,7 @@
 #include "gl_test_host.h"
 
+#include <stdexcept>
+
 namespace waveform_test {
 
 GlTestHost::GlTestHost() {
@@ -33,6 +35,9 @@ uint32_t GlTestHost::vertexArray(vtpl::HostContext context) {
 
 uint32_t GlTestHost::createBuffer(vtpl::HostContext context, uint32_t target, uint32_t size,
                                   const void* data, uint32_t usage, uint32_t* out, int32_t) {
+  if (of(context).failBuffers) {
+    throw std::runtime_error("createBuffer refused");
+  }
   GLuint buffer = 0;
   glGenBuffers(1, &buffer);
   glBindBuffer(target, buffer);

@@ -5,6 +5,7 @@
 #include <array>
 #include <cmath>
 #include <functional>
+#include <stdexcept>
 #include <vector>
 
 #include "gl/framebuffer.h"
@@ -322,6 +323,77 @@ TEST_F(WaveformAnalysis, LinearInputIsEncodedToSrgbBeforeMeasuring) {
     expectOneRowNear(encoded, x, 0, expectedRow(0.5, 8, 256, -0.25, 1.25), "encoded");
     expectOneRowNear(raw, x, 0, expectedRow(0.214041, 8, 256, -0.25, 1.25), "raw");
   }
+}
+
+}  // namespace
+}  // namespace waveform_test
+
+namespace waveform_test {
+namespace {
+
+// The GL state a host cares about, as one comparable record.
+struct HostState {
+  GLint blend, blendSource, stencilTest, program, colourAttachment, viewport[4];
+  bool operator==(const HostState& o) const {
+    return blend == o.blend && blendSource == o.blendSource && stencilTest == o.stencilTest &&
+           program == o.program && colourAttachment == o.colourAttachment &&
+           std::equal(viewport, viewport + 4, o.viewport);
+  }
+};
+
+HostState hostState() {
+  HostState state{};
+  state.blend = glIsEnabled(GL_BLEND);
+  glGetIntegerv(GL_BLEND_SRC_RGB, &state.blendSource);
+  state.stencilTest = glIsEnabled(GL_STENCIL_TEST);
+  glGetIntegerv(GL_CURRENT_PROGRAM, &state.program);
+  glGetFramebufferAttachmentParameteriv(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0,
+                                        GL_FRAMEBUFFER_ATTACHMENT_OBJECT_NAME,
+                                        &state.colourAttachment);
+  glGetIntegerv(GL_VIEWPORT, state.viewport);
+  return state;
+}
+
+// A host callback failing half-way through the pass leaves the host's state as it was.
+TEST_F(WaveformAnalysis, FailingHostCallbackLeavesTheHostsStateAsItWas) {
+  const auto hostTarget = Plugin::gl::Texture::create();
+  hostTarget->define(8, 8, GL_RGBA32F, 1.0f);
+  Plugin::gl::EffectData hostPrograms;
+  ensureAnalysisPrograms(hostPrograms, false);
+  const Plugin::gl::FBO framebuffer;
+  glBindFramebuffer(GL_FRAMEBUFFER, framebuffer.name());
+  glFramebufferTexture2D(GL_FRAMEBUFFER, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D, hostTarget->name(),
+                         0);
+  glViewport(1, 2, 3, 4);
+  glEnable(GL_BLEND);
+  glBlendFunc(GL_SRC_ALPHA, GL_ONE);
+  hostPrograms.useProgram(kWaveformProgram);
+  const HostState before = hostState();
+
+  const auto layer = Plugin::gl::Texture::create();
+  layer->define(4, 4, GL_RGBA8, 1.0f);
+  AnalysisInput input;
+  input.layer.name = layer->name();
+  input.layer.width = input.layer.height = 4;
+  input.target = Plugin::gl::Texture::create();
+  input.target->define(4, 256, GL_RGBA32F, 1.0f);
+  input.fullFrame = true;
+  input.frameWidth = input.frameHeight = 4;
+  input.projection = input.modelView = Plugin::gl::kIdentityMatrix.data();
+  GlTestHost failing;
+  failing.failBuffers = true;
+  Plugin::gl::EffectData programs;
+  ensureAnalysisPrograms(programs, false);
+  Plugin::gl::StencilBufferList pool;
+  std::recursive_mutex lock;
+  hostPrograms.useProgram(kWaveformProgram);
+  EXPECT_THROW(analyseLayer(failing.calls(), {programs, pool, lock, true}, Settings(), input),
+               std::runtime_error);
+  EXPECT_TRUE(hostState() == before);
+  glUseProgram(0);
+  glDisable(GL_BLEND);
+  glBlendFunc(GL_ONE, GL_ZERO);
+  glBindFramebuffer(GL_FRAMEBUFFER, 0);
 }
 
 }  // namespace
