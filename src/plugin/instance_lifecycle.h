@@ -15,16 +15,17 @@ struct ScopesSharedData;
 ScopesEffectData* instanceOf(const vtpl::HostEffectRecord& record);
 ScopesSharedData* sharedDataOf(const vtpl::HostEffectRecord& record);
 
-// Messages 0 and 3: a failed allocation leaves the slot null.
+// Creating the instance and the shared data: a failed allocation leaves the slot null.
 void createInstance(vtpl::HostEffectRecord& record);
 void createSharedData(vtpl::HostEffectRecord& record);
 
-// Message 1: result 1, or 2 with the slot left as it was when destruction fails.
+// Destroying the instance: handled, or not handled with the slot left as it was when
+// destruction fails.
 int32_t destroyInstance(vtpl::HostEffectRecord& record) noexcept;
-// Message 4.
+// Destroying the shared data.
 void destroySharedData(vtpl::HostEffectRecord& record);
 
-// Messages 1001 and 1002; nothing to count without shared data.
+// A scope control attached or detached; nothing to count without shared data.
 void attachControl(vtpl::HostEffectRecord& record);
 void detachControl(vtpl::HostEffectRecord& record);
 

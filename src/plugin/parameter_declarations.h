@@ -1,4 +1,4 @@
-// Declares the effect's 25 parameters, with their groups, to the host (message 2).
+// Declares the effect's 25 parameters, with their groups, to the host (kMessageDeclareParameters).
 #ifndef WAVEFORM_PLUGIN_PARAMETER_DECLARATIONS_H
 #define WAVEFORM_PLUGIN_PARAMETER_DECLARATIONS_H
 

@@ -105,44 +105,6 @@ TEST(ControlPicture, GreyFrameTraceSitsAtItsLevelInsideTheBlackPanel) {
   }
 }
 
-TEST(ControlPicture, OverlayBgDrawsThePrimaryInBlueAndTheComparisonInGreen) {
-  auto host = openTracesOnlyHost();
-  host->parameters().writeInt("scopeComparisonType", 1);
-  host->parameters().writeInt("overlayChannels", 5);
-  host->setComparisonLayer(greyFrame(0.75f));
-  host->renderFrame(greyFrame(0.25f));
-  ASSERT_EQ(host->drawControl(sized(kControlWidth, kControlHeight)), 1);
-  const Image& picture = host->controlPicture();
-  // 0.25 x 30 = 7.5 and 0.75 x 30 = 22.5 pixels above the panel's bottom.
-  for (const int x : {3, 30, 56}) {
-    const std::vector<int> blue = litRows(picture, x, 2);
-    const std::vector<int> green = litRows(picture, x, 1);
-    ASSERT_FALSE(blue.empty()) << "column " << x;
-    ASSERT_FALSE(green.empty()) << "column " << x;
-    EXPECT_NEAR(blue.front(), 32, 1) << "column " << x;
-    EXPECT_NEAR(green.front(), 17, 1) << "column " << x;
-    EXPECT_TRUE(litRows(picture, x, 0).empty()) << "nothing in red, column " << x;
-    EXPECT_EQ(picture.pixel(x, green.front())[2], 0.0f) << "the comparison is green only";
-    EXPECT_EQ(picture.pixel(x, blue.front())[1], 0.0f) << "the primary is blue only";
-  }
-}
-
-TEST(ControlPicture, SideBySideShowsEachLayerInItsHalf) {
-  auto host = openTracesOnlyHost();
-  host->setComparisonLayer(greyFrame(0.75f));
-  host->renderFrame(greyFrame(0.25f));
-  ASSERT_EQ(host->drawControl(sized(kControlWidth, kControlHeight)), 1);
-  const Image& picture = host->controlPicture();
-  for (const int x : {1, 15, 28}) {
-    EXPECT_EQ(litRows(picture, x, 0).size(), 1u) << "column " << x;
-    EXPECT_NEAR(litRows(picture, x, 0).front(), 32, 1) << "column " << x;
-  }
-  for (const int x : {31, 45, 58}) {
-    EXPECT_EQ(litRows(picture, x, 0).size(), 1u) << "column " << x;
-    EXPECT_NEAR(litRows(picture, x, 0).front(), 17, 1) << "column " << x;
-  }
-}
-
 // A drawing of no size has no picture to read back; the message is still sent.
 TEST(ControlPicture, DrawingOfNoSizeLeavesNoPicture) {
   std::ostringstream trace;

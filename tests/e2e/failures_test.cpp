@@ -81,17 +81,6 @@ TEST(Failures, ExceptionDuringDeclarationsBecomesResultFive) {
   }
 }
 
-TEST(Failures, EmptyCallbackSlotsAreReportedNotCalled) {
-  auto host = openHost();
-  host->record().getInt = nullptr;
-  EXPECT_EQ(host->changeParameter("waveformMode"), 5);
-
-  EffectHost declaring(waveformModule(), declaredStateSettings());
-  declaring.record().defineChoice = nullptr;
-  EXPECT_EQ(declareWith(declaring), 5);
-  EXPECT_EQ(declaring.parameters().parameters().size(), 1u);
-}
-
 vtpl::host::Image greyPicture() {
   vtpl::host::Image picture;
   picture.width = 32;

@@ -303,17 +303,5 @@ TEST_F(GpuResources, CopyPassCopiesFloatFramesWithinRounding) {
   }
 }
 
-TEST_F(GpuResources, CopyAndClearProgramsAreBuiltOnce) {
-  EffectData programs;
-  ensureCopyAndClearPrograms(programs, false);
-  const int32_t copy = programs.programId(kCopyProgram);
-  const int32_t clear = programs.programId(kClearProgram);
-  EXPECT_GE(copy, 0);
-  EXPECT_GE(clear, 0);
-  ensureCopyAndClearPrograms(programs, false);
-  EXPECT_EQ(programs.programCount(), 2);
-  EXPECT_EQ(programs.programId(kCopyProgram), copy);
-}
-
 }  // namespace
 }  // namespace waveform_test

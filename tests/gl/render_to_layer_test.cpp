@@ -172,20 +172,6 @@ TEST_F(RenderToLayer, SwappedCornersMirrorBothAxes) {
   }
 }
 
-TEST_F(RenderToLayer, AreaNarrowerThanSixteenPixelsLeavesTheLayer) {
-  ScopeWaveforms waveforms;
-  waveforms.primary = cornerWaveform();
-  const std::vector<Pixel> layer = gradientLayer();
-  const Rendered narrow = render({{-10, 18}, {5, -18}}, kBlendNormal, 1, waveforms);
-  EXPECT_EQ(narrow.allocations, 0u);
-  EXPECT_EQ(narrow.pixels, layer);
-  const Rendered wide = render({{-10, 18}, {6, -18}}, kBlendNormal, 1, waveforms);
-  EXPECT_EQ(wide.allocations, 1u);
-  expectPixel(wide.at(30, 30), {0.2f, 0.3f, 0.4f, 1}, "inside the 16-pixel area");
-  expectPixel(wide.at(20, 30), layer[30 * kFrameWidth + 20], "left of it");
-  expectPixel(wide.at(40, 30), layer[30 * kFrameWidth + 40], "right of it");
-}
-
 TEST_F(RenderToLayer, PaddedAllocationsGiveTheSamePicture) {
   ScopeWaveforms waveforms;
   waveforms.primary = cornerWaveform();

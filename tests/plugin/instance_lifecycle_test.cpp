@@ -14,23 +14,6 @@ namespace {
 
 using namespace plugin::Scopes;
 
-TEST(InstanceLifecycle, SharedDataStartsEmptyAndFresh) {
-  vtpl::HostEffectRecord record{};
-  ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateSharedData), 1);
-  const ScopesSharedData* shared = sharedDataOf(record);
-  ASSERT_NE(shared, nullptr);
-  EXPECT_EQ(shared->primary.texture, nullptr);
-  EXPECT_EQ(shared->primary.width, 0);
-  EXPECT_EQ(shared->primary.height, 0);
-  EXPECT_EQ(shared->comparison.texture, nullptr);
-  EXPECT_EQ(shared->comparison.width, 0);
-  EXPECT_EQ(shared->analysedFrame, -1);
-  EXPECT_EQ(shared->attachmentCount.load(), 0);
-  EXPECT_EQ(shared->resultsFresh.load(), 1);
-  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroySharedData), 1);
-  EXPECT_EQ(record.sharedData, nullptr);
-}
-
 TEST(InstanceLifecycle, AttachAndDetachCount) {
   vtpl::HostEffectRecord record{};
   ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateSharedData), 1);
@@ -63,31 +46,6 @@ TEST(InstanceLifecycle, AttachmentsFromTwoThreadsAreNotLost) {
   interface.join();
   EXPECT_EQ(sharedDataOf(record)->attachmentCount.load(), kRounds);
   notify(nullptr, &record, vtpl::kMessageDestroySharedData);
-}
-
-TEST(InstanceLifecycle, InstanceStartsEmpty) {
-  vtpl::HostEffectRecord record{};
-  ASSERT_EQ(notify(nullptr, &record, vtpl::kMessageCreateInstance), 1);
-  ScopesEffectData* instance = instanceOf(record);
-  ASSERT_NE(instance, nullptr);
-  EXPECT_FALSE(instance->instancedDrawing);
-  EXPECT_TRUE(instance->stencilPool.empty());
-  EXPECT_TRUE(instance->labelCache.empty());
-  EXPECT_TRUE(instance->labelTextSettings.familyName.empty());
-  EXPECT_EQ(instance->programCount(), 0);
-
-  EXPECT_EQ(notify(nullptr, &record, vtpl::kMessageDestroyInstance), 1);
-  EXPECT_EQ(record.instance, nullptr);
-}
-
-TEST(InstanceLifecycle, ResourceLockIsRecursive) {
-  vtpl::HostEffectRecord record{};
-  createInstance(record);
-  ScopesEffectData& instance = *instanceOf(record);
-  std::lock_guard<std::recursive_mutex> outer(instance.resourceLock);
-  EXPECT_TRUE(instance.resourceLock.try_lock());
-  instance.resourceLock.unlock();
-  EXPECT_EQ(destroyInstance(record), 1);
 }
 
 // This test program has no GL: a host that renders or draws the control without having set the

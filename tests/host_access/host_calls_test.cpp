@@ -3,8 +3,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cstring>
-
 namespace {
 
 using Plugin::host::HostCalls;
@@ -16,17 +14,6 @@ int32_t refusingEndGroup(vtpl::HostContext) {
 }
 int32_t acceptingEndGroup(vtpl::HostContext) {
   return 0;
-}
-int32_t contextAsVersion(vtpl::HostContext context) {
-  return *static_cast<const int32_t*>(context);
-}
-
-TEST(HostCalls, PassesTheContextAndReturnsTheAnswer) {
-  HostEffectRecord record{};
-  record.hostVersion = contextAsVersion;
-  int32_t version = 5600;
-  const HostCalls host(&version, record);
-  EXPECT_EQ(host.call(&HostEffectRecord::hostVersion), 5600);
 }
 
 TEST(HostCalls, EmptySlotIsAPluginErrorNotAJump) {
