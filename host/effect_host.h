@@ -1,5 +1,6 @@
 // One effect instance as the editor drives it: the host record with its callback table, the
-// parameter panel, and the messages of the effect's life (3, 0, 2, ..., 1, 4).
+// parameter panel, and the messages of the effect's life (create the shared data, create the
+// instance, declare the parameters, ..., destroy the instance, destroy the shared data).
 #ifndef VTPL_HOST_EFFECT_HOST_H
 #define VTPL_HOST_EFFECT_HOST_H
 
@@ -28,9 +29,10 @@ struct HostSettings {
   // After the declarations, report every parameter once as changed, as the editor does when it
   // opens an effect, so that the effect can set the panel's initial visibility.
   bool announceInitialValues = true;
-  // Run messages on a render and an interface thread with shared headless GL contexts (message
-  // 1003 on the interface thread, all others on the render thread), and send message 8 when
-  // opening. Without it messages run on the caller's thread and no GL is needed.
+  // Run messages on a render and an interface thread with shared headless GL contexts (the
+  // control drawing, kMessageDrawControl, on the interface thread, all others on the render
+  // thread), and send the GL set-up, kMessageSetUp, when opening. Without it messages run on the
+  // caller's thread and no GL is needed.
   bool gl = false;
   // Allocate layer and working textures with power-of-two storage instead of exact sizes.
   bool padTextures = false;
@@ -65,7 +67,7 @@ struct ControlOptions {
   double labelScale = 1.0;                                // the interface's text scale
 };
 
-// A layer the host can report to the effect (message 7 with "Effect_Parent_Layer").
+// A layer the host can report to the effect (a parameter change of "Effect_Parent_Layer").
 struct HostLayer {
   HostLayerInfo info{};
   std::string identifier;  // 36 characters
@@ -81,19 +83,21 @@ class EffectHost {
   EffectHost(const EffectHost&) = delete;
   EffectHost& operator=(const EffectHost&) = delete;
 
-  // Messages 3, 0 and 2 (and the initial announcements). Throws HostError naming the message
-  // that failed, after closing again.
+  // Creates the shared data and the instance and asks for the parameter declarations (then
+  // reports every parameter as changed when announceInitialValues is set, and sends the GL set-up
+  // with GL). Throws HostError naming the message that failed, after closing again.
   void open();
-  // Message 1 while the instance slot is set, then message 4 while the shared slot is set.
+  // Destroys the instance while the instance slot is set, then the shared data while the shared
+  // slot is set.
   void close() noexcept;
 
   // Sends one message with the record as it stands.
   int32_t send(int32_t message);
-  // Message 7 for `id`.
+  // Reports `id` as changed (kMessageParameterChanged).
   int32_t changeParameter(const std::string& id);
-  // Message 13 or 14 for `id`.
+  // Reports `id` as edited by the user (kMessageParameterEdited or kMessageParameterEditedAlt).
   int32_t editParameter(const std::string& id, int32_t message = kMessageParameterEdited);
-  // Message 7 "Effect_Parent_Layer" with a layer of this size.
+  // Reports a change of "Effect_Parent_Layer", the effect's parent layer, to a layer of this size.
   int32_t changeParentLayer(int32_t width, int32_t height);
   // Chooses a layer of this picture as the comparison layer ("overlayLayer"), or none for an
   // empty picture, then reports the change as a user's pick. Returns the new layer (null when
@@ -105,15 +109,17 @@ class EffectHost {
   // A texture of the layer's picture in the calling thread's context, released like working
   // textures; a name of 0 when the layer has no pixels for that frame.
   HostTexture fetchLayer(const HostLayer& layer, int32_t frameIndex);
-  // A user's edit: the value from text, then messages 7 and 13. Throws HostError.
+  // A user's edit: the value from text, then reports of the change and of the edit. Throws
+  // HostError.
   void setValueFromText(const std::string& id, const std::string& text);
-  // Message 10 for one frame of `layer` (8-bit storage, or float storage when asked or when the
-  // picture has 16 bits); returns the output, read back. Needs GL. Throws HostError.
+  // Renders one frame of `layer` (8-bit storage, or float storage when asked or when the picture
+  // has 16 bits); returns the output, read back. Needs GL. Throws HostError.
   Image renderFrame(const Image& layer, bool asFloat = false, const FrameOptions& options = {});
-  // Messages 1001 and 1002, as the editor sends them while a scope panel is open.
+  // Attaches and detaches the scope control (kMessageAttach, kMessageDetach), as the editor does
+  // while a scope panel is open.
   int32_t attachControl() { return send(kMessageAttach); }
   int32_t detachControl() { return send(kMessageDetach); }
-  // Message 1003 for the scope control, on the interface thread. With GL, the control is drawn
+  // Draws the scope control, on the interface thread. With GL, the control is drawn
   // into an 8-bit texture of its size, attached to the thread's framebuffer, cleared to
   // transparent black and with the viewport set to it, as the editor prepares its panel; the
   // picture is read back into controlPicture(). Returns what Notify answered.

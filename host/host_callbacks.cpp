@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstdio>
 #include <cstring>
+#include <type_traits>
 
 #include "effect_host.h"
 #include "gl_thread.h"
@@ -271,69 +272,69 @@ std::string readArguments(const char* id, int32_t time) {
   return inQuotes(id) + ", t=" + std::to_string(time);
 }
 
-float getFloat(HostContext context, const char* id, int32_t time) {
-  EffectHost& host = hostOf(context);
-  host.enterCallback("getFloat");
-  const auto value = static_cast<float>(readNumbers(host, id)[0]);
-  host.trace().callback("getFloat", readArguments(id, time), number(value));
-  return value;
+// What the scalar getters answer for a parameter; an unknown id is noted and reads as zero.
+float readFloat(EffectHost& host, const char* id) {
+  return static_cast<float>(readNumbers(host, id)[0]);
 }
 
-float getAngle(HostContext context, const char* id, int32_t time) {
-  EffectHost& host = hostOf(context);
-  host.enterCallback("getAngle");
-  const auto value = static_cast<float>(readNumbers(host, id)[0]);
-  host.trace().callback("getAngle", readArguments(id, time), number(value));
-  return value;
+uint8_t readBool(EffectHost& host, const char* id) {
+  return readNumbers(host, id)[0] != 0 ? 1 : 0;
 }
 
-uint8_t getBool(HostContext context, const char* id, int32_t time) {
-  EffectHost& host = hostOf(context);
-  host.enterCallback("getBool");
-  const uint8_t value = readNumbers(host, id)[0] != 0 ? 1 : 0;
-  host.trace().callback("getBool", readArguments(id, time), std::to_string(value));
-  return value;
-}
-
-int32_t getInt(HostContext context, const char* id, int32_t time) {
-  EffectHost& host = hostOf(context);
-  host.enterCallback("getInt");
+// A choice answers its item's value, never its position.
+int32_t readInt(EffectHost& host, const char* id) {
   int32_t value = 0;
   if (id == nullptr || !host.parameters().readInt(id, value)) {
     host.noteUnknownId(id);
   }
-  host.trace().callback("getInt", readArguments(id, time), std::to_string(value));
   return value;
 }
 
-void getPoint(HostContext context, const char* id, int32_t time, float* x, float* y) {
+constexpr char kGetFloat[] = "getFloat";
+constexpr char kGetAngle[] = "getAngle";
+constexpr char kGetBool[] = "getBool";
+constexpr char kGetInt[] = "getInt";
+
+// The getFloat, getAngle, getBool and getInt callbacks: the callback named `name` answers what
+// `read` makes of the parameter and traces it (floats as "%g", integers in decimal).
+template <const char* name, typename Value, Value (*read)(EffectHost&, const char*)>
+Value getScalar(HostContext context, const char* id, int32_t time) {
   EffectHost& host = hostOf(context);
-  host.enterCallback("getPoint");
+  host.enterCallback(name);
+  const Value value = read(host, id);
+  if constexpr (std::is_floating_point_v<Value>) {
+    host.trace().callback(name, readArguments(id, time), number(value));
+  } else {
+    host.trace().callback(name, readArguments(id, time), std::to_string(value));
+  }
+  return value;
+}
+
+// The getPoint and getColor callbacks: the callback named `name` writes the parameter's first
+// numbers to the outputs that are not null and traces them as "(a, b, ...)".
+template <size_t count>
+void getNumbers(HostContext context, std::string_view name, const char* id, int32_t time,
+                const std::array<float*, count>& outputs) {
+  EffectHost& host = hostOf(context);
+  host.enterCallback(name);
   const std::array<double, 3> value = readNumbers(host, id);
-  if (x != nullptr) {
-    *x = static_cast<float>(value[0]);
+  std::string traced = "(";
+  for (size_t i = 0; i < count; ++i) {
+    if (outputs[i] != nullptr) {
+      *outputs[i] = static_cast<float>(value[i]);
+    }
+    traced += (i == 0 ? "" : ", ") + number(value[i]);
   }
-  if (y != nullptr) {
-    *y = static_cast<float>(value[1]);
-  }
-  host.trace().callback("getPoint", readArguments(id, time),
-                        "(" + number(value[0]) + ", " + number(value[1]) + ")");
+  host.trace().callback(name, readArguments(id, time), traced + ")");
+}
+
+void getPoint(HostContext context, const char* id, int32_t time, float* x, float* y) {
+  getNumbers<2>(context, "getPoint", id, time, {x, y});
 }
 
 void getColor(HostContext context, const char* id, int32_t time, float* red, float* green,
               float* blue) {
-  EffectHost& host = hostOf(context);
-  host.enterCallback("getColor");
-  const std::array<double, 3> value = readNumbers(host, id);
-  float* outputs[3] = {red, green, blue};
-  for (int i = 0; i < 3; ++i) {
-    if (outputs[i] != nullptr) {
-      *outputs[i] = static_cast<float>(value[i]);
-    }
-  }
-  host.trace().callback(
-      "getColor", readArguments(id, time),
-      "(" + number(value[0]) + ", " + number(value[1]) + ", " + number(value[2]) + ")");
+  getNumbers<3>(context, "getColor", id, time, {red, green, blue});
 }
 
 void* getLayer(HostContext context, const char* id, int32_t time, int32_t layerArgument,
@@ -518,11 +519,11 @@ void installCallbacks(HostEffectRecord& record) {
   record.defineColor = defineColor;
   record.defineLayer = defineLayer;
   record.setParamVisible = setParamVisible;
-  record.getFloat = getFloat;
-  record.getBool = getBool;
-  record.getInt = getInt;
+  record.getFloat = getScalar<kGetFloat, float, readFloat>;
+  record.getBool = getScalar<kGetBool, uint8_t, readBool>;
+  record.getInt = getScalar<kGetInt, int32_t, readInt>;
   record.getPoint = getPoint;
-  record.getAngle = getAngle;
+  record.getAngle = getScalar<kGetAngle, float, readFloat>;
   record.getColor = getColor;
   record.getLayer = getLayer;
   record.getLayerInfo = getLayerInfo;

@@ -42,7 +42,11 @@ bool isLowSurrogate(char32_t c) {
   return c >= 0xDC00 && c <= 0xDFFF;
 }
 
-// Decodes one UTF-8 sequence starting at `i`, advancing `i` past it.
+// Decodes one UTF-8 sequence starting at `i`, advancing `i` past it. A malformed sequence
+// becomes one U+FFFD per maximal subpart: a byte that starts no well-formed sequence, or the
+// longest well-formed beginning of one that is cut short; the byte that cuts it short is left to
+// start the next sequence. The first continuation byte has a narrower range after E0 and F0 (no
+// overlong forms), ED (no surrogates) and F4 (nothing past U+10FFFF).
 char32_t decodeUtf8(std::string_view text, size_t& i) {
   const auto lead = static_cast<uint8_t>(text[i++]);
   if (lead < 0x80) {
@@ -50,27 +54,33 @@ char32_t decodeUtf8(std::string_view text, size_t& i) {
   }
   int length = 0;
   char32_t c = 0;
-  if ((lead & 0xE0) == 0xC0) {
+  uint8_t low = 0x80;
+  uint8_t high = 0xBF;
+  if (lead >= 0xC2 && lead <= 0xDF) {
     length = 1;
     c = lead & 0x1F;
-  } else if ((lead & 0xF0) == 0xE0) {
+  } else if (lead >= 0xE0 && lead <= 0xEF) {
     length = 2;
     c = lead & 0x0F;
-  } else if ((lead & 0xF8) == 0xF0) {
+    low = lead == 0xE0 ? 0xA0 : 0x80;
+    high = lead == 0xED ? 0x9F : 0xBF;
+  } else if (lead >= 0xF0 && lead <= 0xF4) {
     length = 3;
     c = lead & 0x07;
+    low = lead == 0xF0 ? 0x90 : 0x80;
+    high = lead == 0xF4 ? 0x8F : 0xBF;
   } else {
     return kReplacement;
   }
   for (int k = 0; k < length; ++k) {
-    if (i >= text.size() || (static_cast<uint8_t>(text[i]) & 0xC0) != 0x80) {
+    const auto next = i < text.size() ? static_cast<uint8_t>(text[i]) : 0;
+    if (next < low || next > high) {
       return kReplacement;
     }
-    c = (c << 6) | (static_cast<uint8_t>(text[i++]) & 0x3F);
-  }
-  static constexpr char32_t kSmallest[] = {0, 0x80, 0x800, 0x10000};
-  if (c < kSmallest[length] || c > 0x10FFFF || isHighSurrogate(c) || isLowSurrogate(c)) {
-    return kReplacement;
+    c = (c << 6) | (next & 0x3F);
+    ++i;
+    low = 0x80;
+    high = 0xBF;
   }
   return c;
 }

@@ -9,7 +9,9 @@ namespace vtpl::host {
 
 // Unpaired surrogates become U+FFFD.
 std::string toUtf8(std::u16string_view text);
-// Malformed sequences become U+FFFD.
+// Each maximal subpart of a malformed sequence becomes one U+FFFD: a byte that starts no
+// sequence, or the longest well-formed beginning of a sequence that is cut short (the byte that
+// cuts it short starts anew), as the plug-in's own converter does.
 std::u16string toUtf16(std::string_view text);
 
 }  // namespace vtpl::host

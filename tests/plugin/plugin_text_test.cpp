@@ -1,14 +1,17 @@
-// Small text rules of the entry points: bounded copies, choice lists, colour space by height.
+// Small text rules of the entry points (bounded copies, choice lists, colour space by height) and
+// the plug-in's UTF-8 <-> UTF-16 conversions, on the cases the host's converter meets too.
 #include <gtest/gtest.h>
 
 #include <array>
 #include <string>
 #include <vector>
 
+#include "platform/utf16_text.h"
 #include "plugin/parameter_declarations.h"
 #include "plugin/parameter_reactions.h"
 #include "plugin/plugin_info.h"
 #include "scope/parameter_choices.h"
+#include "utf8_decoding_cases.h"
 
 namespace {
 
@@ -74,6 +77,20 @@ TEST(BlendChoices, EveryBlendValueAppearsOnce) {
     ASSERT_LT(item.value, 15);
     EXPECT_FALSE(seen[item.value]) << item.value;
     seen[item.value] = true;
+  }
+}
+
+TEST(Utf16Text, DecodesUtf8AsTheHostDoes) {
+  for (const test_support::Utf8DecodingCase& c : test_support::kUtf8DecodingCases) {
+    const std::string utf8(c.utf8);
+    EXPECT_EQ(platform::toUtf16(utf8), std::u16string(c.utf16)) << testing::PrintToString(utf8);
+  }
+}
+
+TEST(Utf16Text, EncodesUtf16AsTheHostDoes) {
+  for (const test_support::Utf16EncodingCase& c : test_support::kUtf16EncodingCases) {
+    const std::u16string utf16(c.utf16);
+    EXPECT_EQ(platform::toUtf8(utf16), std::string(c.utf8)) << testing::PrintToString(utf16);
   }
 }
 
