@@ -128,12 +128,41 @@ void expectOneRowNear(const Waveform& waveform, int x, int channel, double row,
   EXPECT_LE(std::fabs(lit[0] + 0.5 - row), 1.0) << what << " column " << x;
 }
 
-TEST_F(WaveformAnalysis, GreyFrameLightsOneRowPerColumn) {
-  const Frame grey{12, 16, [](int, int) { return Pixel{0.5f, 0.5f, 0.5f, 1}; }};
-  const Waveform waveform = analyse(grey, {});
-  ASSERT_EQ(waveform.height, 256);
-  for (int x = 0; x < grey.width; ++x) {
-    expectOneRowNear(waveform, x, 0, expectedRow(0.5, 16, 256), "grey");
+// A uniform frame lights one row per column and channel, at the level the mode and colour space
+// give (Luminance puts the pixel's colour at its luma: only red is checked for a red frame).
+TEST_F(WaveformAnalysis, EachModePutsItsChannelsAtTheirLevels) {
+  struct Case {
+    const char* what;
+    Pixel pixel;
+    uint32_t format;
+    int32_t mode;
+    int32_t colorSpace;
+    std::array<double, 3> levels;
+  };
+  const Case cases[] = {
+      {"grey luma", {0.5f, 0.5f, 0.5f, 1}, kEightBit, 0, 709, {0.5, 0.5, 0.5}},
+      {"red in RGB", {1, 0, 0, 1}, kEightBit, 1, 709, {1, 0, 0}},
+      {"grey in CbCr", {0.25f, 0.25f, 0.25f, 1}, kEightBit, 4, 709, {0.25, 0.5, 0.5}},
+      {"red luma 601", {1, 0, 0, 1}, kFloat, 0, 601, {0.299, -1, -1}},
+      {"red luma 709", {1, 0, 0, 1}, kFloat, 0, 709, {0.2126, -1, -1}},
+      {"red luma 2020", {1, 0, 0, 1}, kFloat, 0, 2020, {0.2627, -1, -1}},
+  };
+  for (const Case& c : cases) {
+    const Frame frame{6, 16, [&c](int, int) { return c.pixel; }, c.format};
+    Settings settings;
+    settings.mode = c.mode;
+    settings.colorSpace = c.colorSpace;
+    const Waveform waveform = analyse(frame, settings);
+    ASSERT_EQ(waveform.height, 256) << c.what;
+    const bool extended = c.format == kFloat;
+    for (int x = 0; x < frame.width; ++x) {
+      for (int channel = 0; channel < 3 && c.levels[channel] >= 0; ++channel) {
+        expectOneRowNear(waveform, x, channel,
+                         expectedRow(c.levels[channel], 16, 256, extended ? -0.25 : 0,
+                                     extended ? 1.25 : 1),
+                         std::string(c.what) + " channel " + std::to_string(channel));
+      }
+    }
   }
 }
 
@@ -148,30 +177,6 @@ TEST_F(WaveformAnalysis, HorizontalRampLightsTheRowOfEachColumnsValue) {
   }
 }
 
-TEST_F(WaveformAnalysis, PureRedInRgbModePutsRedAtTheTopAndGreenAndBlueAtTheBottom) {
-  const Frame red{8, 8, [](int, int) { return Pixel{1, 0, 0, 1}; }};
-  Settings rgb;
-  rgb.mode = 1;
-  const Waveform waveform = analyse(red, rgb);
-  for (int x = 0; x < red.width; ++x) {
-    expectOneRowNear(waveform, x, 0, expectedRow(1, 8, 256), "red");
-    expectOneRowNear(waveform, x, 1, expectedRow(0, 8, 256), "green");
-    expectOneRowNear(waveform, x, 2, expectedRow(0, 8, 256), "blue");
-  }
-}
-
-TEST_F(WaveformAnalysis, GreyInCbCrPutsBothColourDifferencesAtTheMiddle) {
-  const Frame grey{8, 8, [](int, int) { return Pixel{0.25f, 0.25f, 0.25f, 1}; }};
-  Settings cbcr;
-  cbcr.mode = 4;
-  const Waveform waveform = analyse(grey, cbcr);
-  for (int x = 0; x < grey.width; ++x) {
-    expectOneRowNear(waveform, x, 0, expectedRow(0.25, 8, 256), "luma");
-    expectOneRowNear(waveform, x, 1, expectedRow(0.5, 8, 256), "Cb");
-    expectOneRowNear(waveform, x, 2, expectedRow(0.5, 8, 256), "Cr");
-  }
-}
-
 TEST_F(WaveformAnalysis, TransparentFrameLeavesTheTextureCleared) {
   const Frame clear{8, 8, [](int, int) { return Pixel{0, 0, 0, 0}; }};
   for (const int32_t mode : {0, 1, 4, 8}) {
@@ -180,21 +185,6 @@ TEST_F(WaveformAnalysis, TransparentFrameLeavesTheTextureCleared) {
     const Waveform waveform = analyse(clear, settings);
     for (const float value : waveform.values) {
       ASSERT_EQ(value, 0.0f) << "mode " << mode;
-    }
-  }
-}
-
-TEST_F(WaveformAnalysis, LumaOfRedFollowsTheColourSpace) {
-  const Frame red{4, 16, [](int, int) { return Pixel{1, 0, 0, 1}; }, kFloat};
-  for (const auto& [space, luma] :
-       std::vector<std::pair<int32_t, double>>{{601, 0.299}, {709, 0.2126}, {2020, 0.2627}}) {
-    Settings settings;
-    settings.colorSpace = space;
-    const Waveform waveform = analyse(red, settings);
-    ASSERT_EQ(waveform.height, 256);
-    for (int x = 0; x < red.width; ++x) {
-      expectOneRowNear(waveform, x, 0, expectedRow(luma, 16, 256, -0.25, 1.25),
-                       "space " + std::to_string(space));
     }
   }
 }
