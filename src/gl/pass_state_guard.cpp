@@ -35,8 +35,8 @@ PassStateGuard::PassStateGuard(Restore when)
   framebuffer_ = integer(GL_DRAW_FRAMEBUFFER_BINDING);
   // The default framebuffer's attachments are not the effect's to change.
   if (framebuffer_ != 0) {
-    for (auto [attachment, saved] : {std::pair{GL_COLOR_ATTACHMENT0, &colour_},
-                                     std::pair{GL_STENCIL_ATTACHMENT, &stencil_}}) {
+    for (auto [attachment, saved] :
+         {std::pair{GL_COLOR_ATTACHMENT0, &colour_}, std::pair{GL_STENCIL_ATTACHMENT, &stencil_}}) {
       saved->type = attachmentParameter(attachment, GL_FRAMEBUFFER_ATTACHMENT_OBJECT_TYPE);
       if (saved->type != GL_NONE) {
         saved->name = attachmentParameter(attachment, GL_FRAMEBUFFER_ATTACHMENT_OBJECT_NAME);
@@ -71,14 +71,15 @@ void PassStateGuard::restore() const {
   enable(GL_STENCIL_TEST, stencilTest_);
   glStencilFunc(static_cast<GLenum>(stencilFunction_[0]), stencilFunction_[1],
                 static_cast<GLuint>(stencilFunction_[2]));
-  glStencilOp(static_cast<GLenum>(stencilOperations_[0]), static_cast<GLenum>(stencilOperations_[1]),
+  glStencilOp(static_cast<GLenum>(stencilOperations_[0]),
+              static_cast<GLenum>(stencilOperations_[1]),
               static_cast<GLenum>(stencilOperations_[2]));
   glColorMask(colourMask_[0], colourMask_[1], colourMask_[2], colourMask_[3]);
   glUseProgram(static_cast<GLuint>(program_));
   glBindFramebuffer(GL_FRAMEBUFFER, static_cast<GLuint>(framebuffer_));
   if (framebuffer_ != 0) {
-    for (auto [attachment, saved] : {std::pair{GL_COLOR_ATTACHMENT0, &colour_},
-                                     std::pair{GL_STENCIL_ATTACHMENT, &stencil_}}) {
+    for (auto [attachment, saved] :
+         {std::pair{GL_COLOR_ATTACHMENT0, &colour_}, std::pair{GL_STENCIL_ATTACHMENT, &stencil_}}) {
       const auto name = static_cast<GLuint>(saved->name);
       if (saved->type == GL_RENDERBUFFER) {
         glFramebufferRenderbuffer(GL_FRAMEBUFFER, attachment, GL_RENDERBUFFER, name);

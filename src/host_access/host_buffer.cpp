@@ -2,11 +2,11 @@
 
 namespace Plugin::host {
 
-HostBuffer::HostBuffer(const HostCalls& host, uint32_t target, const void* data,
-                       uint32_t sizeBytes, uint32_t usage)
+HostBuffer::HostBuffer(const HostCalls& host, uint32_t target, const void* data, uint32_t sizeBytes,
+                       uint32_t usage)
     : record_(host.record()), context_(host.context()) {
-  name_ = host.call(&vtpl::HostEffectRecord::createBuffer, target, sizeBytes, data, usage,
-                    &filled_, 0);
+  name_ =
+      host.call(&vtpl::HostEffectRecord::createBuffer, target, sizeBytes, data, usage, &filled_, 0);
 }
 
 HostBuffer::~HostBuffer() {

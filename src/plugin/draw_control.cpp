@@ -2,15 +2,15 @@
 
 #include <cstring>
 
+#include "gl/pass_state_guard.h"
 #include "gl/quad_maths.h"
 #include "gl/texture_units.h"
-#include "plugin/instance_lifecycle.h"
-#include "plugin/scopes_effect_data.h"
-#include "plugin/waveform_results.h"
-#include "gl/pass_state_guard.h"
 #include "plugin/comparison_layer.h"
+#include "plugin/instance_lifecycle.h"
 #include "plugin/parameter_ids.h"
 #include "plugin/scope_settings_reader.h"
+#include "plugin/scopes_effect_data.h"
+#include "plugin/waveform_results.h"
 #include "scope/scope_composition.h"
 #include "scope/waveform_analysis.h"
 

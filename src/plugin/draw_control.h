@@ -1,4 +1,5 @@
-// The draw-control message (kMessageDrawControl): the host's interface thread asks for the scope control to be drawn.
+// The draw-control message (kMessageDrawControl): the host's interface thread asks for the scope
+// control to be drawn.
 #ifndef WAVEFORM_PLUGIN_DRAW_CONTROL_H
 #define WAVEFORM_PLUGIN_DRAW_CONTROL_H
 

@@ -2,8 +2,8 @@
 
 #include <vector>
 
-#include "scope/parameter_choices.h"
 #include "plugin/parameter_ids.h"
+#include "scope/parameter_choices.h"
 
 namespace plugin::Scopes {
 namespace {

@@ -3,8 +3,8 @@
 #include <initializer_list>
 #include <string_view>
 
-#include "scope/parameter_choices.h"
 #include "plugin/parameter_ids.h"
+#include "scope/parameter_choices.h"
 
 namespace plugin::Scopes {
 namespace {

@@ -1,5 +1,6 @@
 // How the effect keeps the host's parameter panel tidy when values change: it shows and hides
-// dependent parameters and keeps the colour space in step with the layer (parameter changed and parameter edited messages).
+// dependent parameters and keeps the colour space in step with the layer (parameter changed and
+// parameter edited messages).
 #ifndef WAVEFORM_PLUGIN_PARAMETER_REACTIONS_H
 #define WAVEFORM_PLUGIN_PARAMETER_REACTIONS_H
 
@@ -15,7 +16,8 @@ inline constexpr char kEffectParentLayer[] = "Effect_Parent_Layer";
 // The colour space a layer of this height is most likely graded in.
 int32_t colorSpaceForLayerHeight(int32_t height);
 
-// A parameter changed (kMessageParameterChanged). `changedId` may be null (the host named nothing), which changes nothing.
+// A parameter changed (kMessageParameterChanged). `changedId` may be null (the host named nothing),
+// which changes nothing.
 void parameterChanged(const Plugin::host::HostCalls& host, const char* changedId);
 
 // A parameter edited by the user (kMessageParameterEdited and its alternative): a colour space

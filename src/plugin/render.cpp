@@ -4,11 +4,11 @@
 
 #include "gl/copy_pass.h"
 #include "gl/texture_units.h"
+#include "plugin/comparison_layer.h"
 #include "plugin/instance_lifecycle.h"
+#include "plugin/scope_settings_reader.h"
 #include "plugin/scopes_effect_data.h"
 #include "plugin/waveform_results.h"
-#include "plugin/comparison_layer.h"
-#include "plugin/scope_settings_reader.h"
 #include "scope/parameter_choices.h"
 #include "scope/render_to_layer.h"
 #include "scope/waveform_analysis.h"

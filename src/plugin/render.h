@@ -1,4 +1,5 @@
-// The render message (kMessageRender): renders one frame of the effect into the host's output texture.
+// The render message (kMessageRender): renders one frame of the effect into the host's output
+// texture.
 #ifndef WAVEFORM_PLUGIN_RENDER_H
 #define WAVEFORM_PLUGIN_RENDER_H
 

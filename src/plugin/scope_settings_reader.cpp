@@ -73,8 +73,8 @@ RenderToLayerSettings readRenderToLayerSettings(const HostCalls& host, int32_t t
   settings.showColourBars = readBool(host, ParamId::kRenderToLayerShowStandardColorBars, time);
   settings.labelScale = readFloat(host, ParamId::kRenderToLayerLabelScale, time);
   auto& [red, green, blue] = settings.backgroundColour;
-  host.call(&HostEffectRecord::getColor, ParamId::kRenderToLayerBackgroundColor, time, &red,
-            &green, &blue);
+  host.call(&HostEffectRecord::getColor, ParamId::kRenderToLayerBackgroundColor, time, &red, &green,
+            &blue);
   settings.backgroundAlpha = readFloat(host, ParamId::kRenderToLayerBackgroundAlpha, time);
   return settings;
 }

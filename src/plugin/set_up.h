@@ -1,5 +1,5 @@
-// The set-up message (kMessageSetUp): loads the GL entry points and builds the instance's programs, with the host's
-// context current.
+// The set-up message (kMessageSetUp): loads the GL entry points and builds the instance's programs,
+// with the host's context current.
 #ifndef WAVEFORM_PLUGIN_SET_UP_H
 #define WAVEFORM_PLUGIN_SET_UP_H
 

@@ -139,7 +139,8 @@ void ensureBlendProgram(EffectData& programs, bool echo) {
                          {echo, Plugin::gl::AttributeNames::kStored, Plugin::gl::TexCoords::kOne});
 }
 
-void drawBlendPass(const Plugin::host::HostCalls& host, EffectData& programs, const BlendPass& pass) {
+void drawBlendPass(const Plugin::host::HostCalls& host, EffectData& programs,
+                   const BlendPass& pass) {
   programs.useProgram(kBlendShaderProgram);
   setMatrix(programs, Plugin::gl::kProjectionUniform, pass.projection);
   setMatrix(programs, Plugin::gl::kModelViewUniform, pass.modelView);

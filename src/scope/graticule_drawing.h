@@ -6,8 +6,8 @@
 #include <vector>
 
 #include "gl/effect_data.h"
-#include "host_access/host_calls.h"
 #include "gl/quad_maths.h"
+#include "host_access/host_calls.h"
 #include "scope/guidelines.h"
 
 namespace plugin::Scopes {

@@ -3,10 +3,10 @@
 #include <algorithm>
 #include <cmath>
 
+#include "gl/pass_state_guard.h"
 #include "gl/texture_units.h"
 #include "host_access/working_texture.h"
 #include "scope/blend_shader.h"
-#include "gl/pass_state_guard.h"
 #include "scope/scope_composition.h"
 
 namespace plugin::Scopes {

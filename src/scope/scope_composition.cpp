@@ -3,12 +3,12 @@
 #include <algorithm>
 #include <cmath>
 
+#include "gl/pass_state_guard.h"
 #include "gl/quad_maths.h"
 #include "scope/channel_modes.h"
 #include "scope/graticule_drawing.h"
 #include "scope/guidelines.h"
 #include "scope/parameter_choices.h"
-#include "gl/pass_state_guard.h"
 #include "scope/scope_layout.h"
 #include "scope/waveform_display.h"
 
@@ -107,9 +107,8 @@ void drawScope(const HostCalls& host, Plugin::gl::EffectData& programs,
   const bool hasPrimary = waveforms.primary.texture != nullptr;
   const bool hasComparison = waveforms.comparison.texture != nullptr;
   const CompositionSettings& settings = drawing.composition;
-  const ScopeLayout layout =
-      decideLayout(hasPrimary, hasComparison, settings.comparison.type,
-                   hasComparison && settings.comparison.showComparison);
+  const ScopeLayout layout = decideLayout(hasPrimary, hasComparison, settings.comparison.type,
+                                          hasComparison && settings.comparison.showComparison);
 
   // The range and margins follow the waveform shown first.
   const WaveformResult* reference = layout.drawPrimary      ? &waveforms.primary

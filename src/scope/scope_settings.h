@@ -18,13 +18,13 @@ struct ComparisonSettings {
 
 // What the analysis pass measures and how.
 struct AnalysisSettings {
-  int32_t mode = 0;               // "waveformMode"
-  float directionDegrees = 0;     // "waveformDirection"
-  int32_t downsample = 0;         // "analysisDownsample"
-  int32_t colorSpace = 0;         // "colorSpace"
-  float brightness = 0;           // "waveformBrightness"
-  FramePoint clipStart{};         // "clipStartPos"
-  FramePoint clipEnd{};           // "clipEndPos"
+  int32_t mode = 0;            // "waveformMode"
+  float directionDegrees = 0;  // "waveformDirection"
+  int32_t downsample = 0;      // "analysisDownsample"
+  int32_t colorSpace = 0;      // "colorSpace"
+  float brightness = 0;        // "waveformBrightness"
+  FramePoint clipStart{};      // "clipStartPos"
+  FramePoint clipEnd{};        // "clipEndPos"
 };
 
 // How the scope picture arranges and colours the waveforms.
@@ -45,15 +45,15 @@ struct LabelSettings {
 
 // The scope rendered into the layer: where, with what, and how it is blended.
 struct RenderToLayerSettings {
-  int32_t blend = 0;              // "blendType"
-  FramePoint topLeft{};           // "scopePositionTL"
-  FramePoint bottomRight{};       // "scopePositionBR"
-  bool showGuidelines = false;    // "renderToLayerShowGuidelines"
-  bool showAxisLabels = false;    // "renderToLayerShowsAxisLabel"
-  bool showColourBars = false;    // "renderToLayerShowStandardColorBars"
-  float labelScale = 1;           // "renderToLayerLabelScale"
+  int32_t blend = 0;                        // "blendType"
+  FramePoint topLeft{};                     // "scopePositionTL"
+  FramePoint bottomRight{};                 // "scopePositionBR"
+  bool showGuidelines = false;              // "renderToLayerShowGuidelines"
+  bool showAxisLabels = false;              // "renderToLayerShowsAxisLabel"
+  bool showColourBars = false;              // "renderToLayerShowStandardColorBars"
+  float labelScale = 1;                     // "renderToLayerLabelScale"
   std::array<float, 3> backgroundColour{};  // "renderToLayerBackgroundColor"
-  float backgroundAlpha = 0;      // "renderToLayerBackgroundAlpha"
+  float backgroundAlpha = 0;                // "renderToLayerBackgroundAlpha"
 };
 
 }  // namespace plugin::Scopes

@@ -5,9 +5,9 @@
 #include <cstdio>
 #include <vector>
 
-#include "gl/texture_units.h"
 #include "gl/pass_state_guard.h"
 #include "gl/stencil_buffer.h"
+#include "gl/texture_units.h"
 #include "gl/textured_quad_program.h"
 #include "gl/vertex_attributes.h"
 #include "gl/vertex_buffer.h"
@@ -142,9 +142,8 @@ PointPlan planPoints(const AnalysisSettings& settings, const AnalysisInput& inpu
   PointPlan plan;
   plan.grid = samplingGrid(settings, input, factor);
   plan.eightBitLayer = input.layer.format == kEightBitFormat;
-  plan.intensity =
-      pointIntensity(settings.brightness, static_cast<float>(input.target->height()),
-                     plan.eightBitLayer, static_cast<float>(input.layer.height));
+  plan.intensity = pointIntensity(settings.brightness, static_cast<float>(input.target->height()),
+                                  plan.eightBitLayer, static_cast<float>(input.layer.height));
   const int32_t cap = saturationCap(plan.intensity);
   plan.stencilReference = std::min(writesAllChannels(settings.mode) ? 3 * cap : cap, 255);
   return plan;
@@ -174,7 +173,8 @@ void setAnalysisUniforms(const EffectData& programs, const AnalysisSettings& set
   programs.setUniform2f(location(shader::kFrameSize), static_cast<float>(input.frameWidth),
                         static_cast<float>(input.frameHeight));
   programs.setUniform2f(location(shader::kLayerExtent), input.layer.uMax, input.layer.vMax);
-  programs.setUniform1f(location(shader::kDirection), settings.directionDegrees * kDegreesToRadians);
+  programs.setUniform1f(location(shader::kDirection),
+                        settings.directionDegrees * kDegreesToRadians);
   programs.setUniform2i(location(shader::kGridOrigin), plan.grid.x0, plan.grid.y0);
   programs.setUniform2f(location(shader::kSamplingScale), plan.grid.sx, plan.grid.sy);
   programs.setUniform1f(location(shader::kIntensity), plan.intensity);

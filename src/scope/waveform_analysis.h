@@ -7,9 +7,9 @@
 #include <string>
 
 #include "gl/effect_data.h"
-#include "host_access/host_calls.h"
 #include "gl/resource_types.h"
 #include "gl/texture.h"
+#include "host_access/host_calls.h"
 #include "scope/scope_settings.h"
 #include "vtpl/host_interface.h"
 

@@ -2,9 +2,9 @@
 
 #include <cstdio>
 
+#include "gl/texture_units.h"
 #include "gl/textured_quad_program.h"
 #include "gl/vertex_buffer.h"
-#include "gl/texture_units.h"
 #include "scope/colour_space.h"
 #include "scope/parameter_choices.h"
 
@@ -133,9 +133,9 @@ const std::string& waveformDisplayFragmentSource() {
 void ensureWaveformDisplayPrograms(EffectData& programs, bool echo) {
   const Plugin::gl::ProgramOptions options{echo, Plugin::gl::AttributeNames::kStored,
                                            Plugin::gl::TexCoords::kOne};
-  programs.ensureProgram(kCopyWaveformProgram,
-                         {Plugin::gl::kTexturedQuadVertexSource, {}, waveformDisplayFragmentSource()},
-                         options);
+  programs.ensureProgram(
+      kCopyWaveformProgram,
+      {Plugin::gl::kTexturedQuadVertexSource, {}, waveformDisplayFragmentSource()}, options);
   programs.ensureProgram(kFillWaveformBackgroundProgram,
                          {Plugin::gl::kTexturedQuadVertexSource, {}, kFillFragmentSource}, options);
 }

@@ -7,8 +7,8 @@
 #include <string>
 
 #include "gl/effect_data.h"
-#include "host_access/host_calls.h"
 #include "gl/quad_maths.h"
+#include "host_access/host_calls.h"
 #include "scope/channel_modes.h"
 
 namespace plugin::Scopes {

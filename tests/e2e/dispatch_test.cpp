@@ -42,9 +42,9 @@ TEST(Dispatch, CodesWithoutActionAnswerAndTouchNothing) {
   // Acknowledged; gaps inside the handled range and everything outside it; reactions with no
   // parameter named.
   const CodeCase cases[] = {
-      {11, 1},   {1004, 1},  {1007, 1}, {1011, 1},      {5, 2},  {6, 2},         {9, 2},
-      {12, 2},   {15, 2},    {101, 2},  {1000, 2},      {1012, 2}, {INT32_MAX, 2}, {-1, 2},
-      {-1001, 2}, {INT32_MIN, 2}, {7, 1}, {13, 1},      {14, 1},
+      {11, 1},    {1004, 1},      {1007, 1}, {1011, 1}, {5, 2},    {6, 2},         {9, 2},
+      {12, 2},    {15, 2},        {101, 2},  {1000, 2}, {1012, 2}, {INT32_MAX, 2}, {-1, 2},
+      {-1001, 2}, {INT32_MIN, 2}, {7, 1},    {13, 1},   {14, 1},
   };
   auto host = openHost();
   for (const CodeCase& c : cases) {

@@ -31,7 +31,7 @@ class GlTestHost {
   uint32_t allocatedHeight = 0;
   std::vector<AllocationRequest> allocations;
   std::vector<uint32_t> releasedLayers;  // texture names handed back with releaseLayer
-  bool failBuffers = false;  // createBuffer throws, as a failing host callback would
+  bool failBuffers = false;              // createBuffer throws, as a failing host callback would
   int buffersCreated = 0;
   int buffersReleased = 0;
 

@@ -7,12 +7,12 @@
 #include "gl/copy_pass.h"
 #include "gl/framebuffer.h"
 #include "gl/quad_maths.h"
-#include "gl/texture_units.h"
-#include "host_access/working_texture.h"
 #include "gl/stencil_buffer.h"
 #include "gl/texture.h"
+#include "gl/texture_units.h"
 #include "gl_test_context.h"
 #include "gl_test_host.h"
+#include "host_access/working_texture.h"
 
 namespace waveform_test {
 namespace {

@@ -157,10 +157,10 @@ TEST_F(WaveformAnalysis, EachModePutsItsChannelsAtTheirLevels) {
     const bool extended = c.format == kFloat;
     for (int x = 0; x < frame.width; ++x) {
       for (int channel = 0; channel < 3 && c.levels[channel] >= 0; ++channel) {
-        expectOneRowNear(waveform, x, channel,
-                         expectedRow(c.levels[channel], 16, 256, extended ? -0.25 : 0,
-                                     extended ? 1.25 : 1),
-                         std::string(c.what) + " channel " + std::to_string(channel));
+        expectOneRowNear(
+            waveform, x, channel,
+            expectedRow(c.levels[channel], 16, 256, extended ? -0.25 : 0, extended ? 1.25 : 1),
+            std::string(c.what) + " channel " + std::to_string(channel));
       }
     }
   }
