@@ -6,6 +6,7 @@
 
 #include <filesystem>
 #include <map>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -29,7 +30,7 @@ using platform::toUtf8;
 class FakeSystem : public platform::SystemServices {
  public:
   std::optional<std::u16string> folder;
-  std::map<FontHive, std::optional<std::vector<InstalledFont>>> lists;
+  std::map<FontHive, std::vector<InstalledFont>> lists;
   std::vector<EnumeratedFace> faces;
   mutable std::vector<std::u16string> askedFaceNames;  // by the second enumeration pass
 
@@ -40,12 +41,9 @@ class FakeSystem : public platform::SystemServices {
   }
   std::vector<EnumeratedFace> enumerateFamilies() const override {
     std::vector<EnumeratedFace> families;
+    std::set<std::u16string> seen;
     for (const EnumeratedFace& face : faces) {
-      bool known = false;
-      for (const EnumeratedFace& family : families) {
-        known = known || family.faceName == face.faceName;
-      }
-      if (!known) {
+      if (seen.insert(face.faceName).second) {
         families.push_back(face);
       }
     }
@@ -95,11 +93,7 @@ class FontCacheOnFakeSystem : public testing::Test {
     return toUtf16(path.string());
   }
   void install(FontHive hive, const std::u16string& name, const std::u16string& file) {
-    auto& list = system_->lists[hive];
-    if (!list) {
-      list.emplace();
-    }
-    list->push_back({name, file});
+    system_->lists[hive].push_back({name, file});
   }
   void enumerate(const std::u16string& family, const std::u16string& style,
                  const std::u16string& fullName, int32_t type = platform::kTrueTypeFontType) {

@@ -6,8 +6,13 @@
 #include <cmath>
 #include <limits>
 
+#include "polygon_area.h"
+
 namespace qvtl::geometry {
 namespace {
+
+using waveform_test::reversed;
+using waveform_test::square;
 
 using vesk::plugin::lib::CurveContour;
 using vesk::plugin::lib::GlyphDescriptor;
@@ -23,21 +28,10 @@ CurveContour polygon(const PointList& points) {
   return contour;
 }
 
-// Clockwise square with corners (x0, y0) and (x1, y1), y up.
-PointList clockwiseSquare(float x0, float y0, float x1, float y1) {
-  return {{x0, y0}, {x0, y1}, {x1, y1}, {x1, y0}};
-}
-
-PointList reversed(PointList points) {
-  std::reverse(points.begin(), points.end());
-  return points;
-}
-
 // Outer clockwise and inner counter-clockwise, as TrueType outlines come.
 GlyphDescriptor letterO() {
   GlyphDescriptor glyph;
-  glyph.contours = {polygon(clockwiseSquare(0, 0, 10, 10)),
-                    polygon(reversed(clockwiseSquare(3, 3, 7, 7)))};
+  glyph.contours = {polygon(reversed(square(0, 0, 10, 10))), polygon(square(3, 3, 7, 7))};
   return glyph;
 }
 
@@ -110,7 +104,7 @@ TEST(CharacterOutline, LoopsPerGlyphAreCapped) {
   GlyphDescriptor glyph;
   for (int k = 0; k < 1500; ++k) {
     const float x = static_cast<float>(3 * k);
-    glyph.contours.push_back(polygon(reversed(clockwiseSquare(x, 0, x + 2, 2))));
+    glyph.contours.push_back(polygon(square(x, 0, x + 2, 2)));
   }
   const auto outline = makeCharacterOutline(glyph, GlyphOutlineRequest{});
   EXPECT_EQ(outline->contours.size(), 1500u);

@@ -5,16 +5,14 @@
 #include <limits>
 
 #include "geometry/qv_path.h"
+#include "polygon_area.h"
 
 namespace qvtl::geometry {
 namespace {
 
-const PointList kUnitSquare{{0, 0}, {1, 0}, {1, 1}, {0, 1}};  // counter-clockwise, y up
+using waveform_test::reversed;
 
-PointList reversed(PointList points) {
-  std::reverse(points.begin(), points.end());
-  return points;
-}
+const PointList kUnitSquare{{0, 0}, {1, 0}, {1, 1}, {0, 1}};  // counter-clockwise, y up
 
 TEST(Paths, CleanPathRemovesRepeatsAndSpikesButKeepsCollinearPoints) {
   struct Case {

@@ -11,17 +11,11 @@
 namespace qvtl::geometry {
 namespace {
 
+using waveform_test::reversed;
+using waveform_test::square;
+
 using waveform_test::signedArea;
 using waveform_test::trianglesArea;
-
-PointList square(float x0, float y0, float x1, float y1) {
-  return {{x0, y0}, {x1, y0}, {x1, y1}, {x0, y1}};
-}
-
-PointList reversed(PointList points) {
-  std::reverse(points.begin(), points.end());
-  return points;
-}
 
 CharacterOutline outlineOf(const std::vector<PointList>& contours) {
   CharacterOutline outline;

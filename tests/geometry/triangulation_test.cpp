@@ -13,6 +13,9 @@
 namespace qvtl::geometry {
 namespace {
 
+using waveform_test::reversed;
+using waveform_test::square;
+
 using waveform_test::insideRing;
 using waveform_test::signedArea;
 
@@ -64,13 +67,6 @@ void expectCoveredOnce(const PointList& outer, const std::vector<PointList>& hol
   }
 }
 
-PointList rectangle(float x0, float y0, float x1, float y1) {
-  return {{x0, y0}, {x1, y0}, {x1, y1}, {x0, y1}};
-}
-PointList reversed(PointList ring) {
-  std::reverse(ring.begin(), ring.end());
-  return ring;
-}
 // Star-shaped around (cx, cy), counter-clockwise: radii between the two at evenly spaced angles.
 PointList star(int count, float cx, float cy, const std::function<float()>& radius) {
   PointList ring;
@@ -123,7 +119,7 @@ TEST(EarScore, ScoresEveryCornerOfAnLShape) {
 }
 
 TEST(ClipEars, StopsAtTheIterationCapAndRecordsDiagonals) {
-  TriangulationGraph graph = graphOf(rectangle(0, 0, 1, 1));
+  TriangulationGraph graph = graphOf(square(0, 0, 1, 1));
   TriangulationRing ring = ringOf(4);
   std::vector<Triangle> triangles;
   clipEars(graph, ring, 1, triangles);
@@ -145,7 +141,7 @@ TEST(TriangulatePolygon, StartsAtTheSharpestCornerFirstOnTies) {
   } cases[] = {
       {"kite", kite, 0},
       {"kite turned", {kite[2], kite[3], kite[0], kite[1]}, 2},
-      {"square ties", rectangle(0, 0, 1, 1), 0},
+      {"square ties", square(0, 0, 1, 1), 0},
       {"hexagon ties", regularPolygon(6, 5), 0},
       {"triangle", {{0, 0}, {5, 0}, {0, 1}}, 1},
   };
@@ -181,24 +177,23 @@ PointList spiral(int turns, int perTurn) {
 }
 
 TEST(TriangulatePolygon, CoversTheFilledAreaOnce) {
-  const PointList square = rectangle(0, 0, 10, 10);
+  const PointList ten = square(0, 0, 10, 10);
   struct Case {
     std::string name;
     PointList outer;
     std::vector<PointList> holes;
   } cases[] = {
-      {"letter O", square, {reversed(rectangle(3, 3, 7, 7))}},
-      {"hole given counter-clockwise", square, {rectangle(3, 3, 7, 7)}},
-      {"outer given clockwise", reversed(square), {reversed(rectangle(3, 3, 7, 7))}},
-      {"two holes", square, {reversed(rectangle(1, 1, 4, 9)), reversed(rectangle(6, 1, 9, 9))}},
+      {"letter O", ten, {reversed(square(3, 3, 7, 7))}},
+      {"hole given counter-clockwise", ten, {square(3, 3, 7, 7)}},
+      {"outer given clockwise", reversed(ten), {reversed(square(3, 3, 7, 7))}},
+      {"two holes", ten, {reversed(square(1, 1, 4, 9)), reversed(square(6, 1, 9, 9))}},
       {"holes sharing a rightmost x",
-       square,
-       {reversed(rectangle(1, 1, 4, 4)), reversed(rectangle(1, 6, 4, 9)),
-        reversed(rectangle(6, 2, 9, 8))}},
-      {"free triangle hole", square, {{{2.3f, 4.1f}, {3.7f, 7.9f}, {5.9f, 3.3f}}}},
+       ten,
+       {reversed(square(1, 1, 4, 4)), reversed(square(1, 6, 4, 9)), reversed(square(6, 2, 9, 8))}},
+      {"free triangle hole", ten, {{{2.3f, 4.1f}, {3.7f, 7.9f}, {5.9f, 3.3f}}}},
       {"hole in a concave outer",
        {{0, 0}, {10, 0}, {10, 10}, {6, 10}, {6, 4}, {4, 4}, {4, 10}, {0, 10}},
-       {reversed(rectangle(1, 1, 3, 8))}},
+       {reversed(square(1, 1, 3, 8))}},
       {"octagon with octagon hole", regularPolygon(8, 10), {reversed(regularPolygon(8, 6))}},
       {"comb", comb(7), {}},
       {"comb of one tooth", comb(1), {}},
@@ -255,7 +250,7 @@ TEST(TriangulatePolygon, DegenerateInputGivesNoArea) {
       {"all points equal", PointList(10, {3, 3}), {}, 0},
       {"collinear", line, {}, line.size() - 2},
       {"NaN", {{0, 0}, {1, 0}, {nan, 1}}, {}, 0},
-      {"infinite hole point", rectangle(0, 0, 4, 4), {{{1, 1}, {inf, 1}, {1, 2}}}, 0},
+      {"infinite hole point", square(0, 0, 4, 4), {{{1, 1}, {inf, 1}, {1, 2}}}, 0},
       {"too many points", regularPolygon(kMaxTriangulationPoints + 1, 100), {}, 0},
   };
   for (const Case& c : cases) {
@@ -268,7 +263,7 @@ TEST(TriangulatePolygon, DegenerateInputGivesNoArea) {
             2u);
   // Holes of fewer than 3 distinct points or no area are left out.
   const TriangulationResult result = triangulatePolygon(
-      rectangle(0, 0, 4, 4), {{{1, 1}, {2, 2}}, {{1, 1}, {2, 1}, {3, 1}}}, 99999999);
+      square(0, 0, 4, 4), {{{1, 1}, {2, 2}}, {{1, 1}, {2, 1}, {3, 1}}}, 99999999);
   EXPECT_EQ(result.vertices.size(), 9u);
   EXPECT_NEAR(coveredArea(result), 16.0, 1e-9);
 }

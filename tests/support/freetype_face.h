@@ -13,8 +13,20 @@ namespace waveform_test {
 class FreeTypeFace {
  public:
   // Null when FreeType cannot open the face; a pixel size of 0 sets none.
-  explicit FreeTypeFace(const std::string& path, long faceIndex = 0, unsigned pixelSize = 0);
-  ~FreeTypeFace();
+  explicit FreeTypeFace(const std::string& path, long faceIndex = 0, unsigned pixelSize = 0) {
+    if (FT_Init_FreeType(&library_) != 0 ||
+        FT_New_Face(library_, path.c_str(), faceIndex, &face_) != 0) {
+      face_ = nullptr;
+    } else if (pixelSize != 0) {
+      FT_Set_Pixel_Sizes(face_, 0, pixelSize);
+    }
+  }
+  ~FreeTypeFace() {
+    if (face_ != nullptr) {
+      FT_Done_Face(face_);
+    }
+    FT_Done_FreeType(library_);
+  }
   FreeTypeFace(const FreeTypeFace&) = delete;
   FreeTypeFace& operator=(const FreeTypeFace&) = delete;
 

@@ -1,8 +1,9 @@
-// Areas, containment and simplicity of polygons, in double, for checking what triangulations
-// cover.
+// Rings to triangulate, and their areas, containment and simplicity (in double), for checking
+// what triangulations cover.
 #ifndef WAVEFORM_TESTS_SUPPORT_POLYGON_AREA_H
 #define WAVEFORM_TESTS_SUPPORT_POLYGON_AREA_H
 
+#include <algorithm>
 #include <cmath>
 #include <cstdint>
 #include <vector>
@@ -10,6 +11,16 @@
 #include "geometry/point2.h"
 
 namespace waveform_test {
+
+// The rectangle with corners (x0, y0) and (x1, y1), counter-clockwise with y up.
+inline qvtl::geometry::PointList square(float x0, float y0, float x1, float y1) {
+  return {{x0, y0}, {x1, y0}, {x1, y1}, {x0, y1}};
+}
+
+inline qvtl::geometry::PointList reversed(qvtl::geometry::PointList ring) {
+  std::reverse(ring.begin(), ring.end());
+  return ring;
+}
 
 // The shoelace formula: positive for a counter-clockwise ring (y up).
 inline double signedArea(const qvtl::geometry::PointList& ring) {

@@ -94,8 +94,7 @@ SfntFont& SfntFont::setPost(int16_t underlinePosition, int16_t underlineThicknes
 SfntFont& SfntFont::setFvar(const FvarTable& fvar) {
   const uint16_t instanceSize = 4 + 4 * fvar.axisCount + (fvar.postScriptNameIDs ? 2 : 0);
   std::vector<uint8_t> table;
-  // Version 1.0, axesArrayOffset 16, reserved 2, axisCount, axisSize 20, the
-  // instances' count and size.
+  // Version 1.0, axesArrayOffset 16, reserved 2, axisCount, axisSize 20, instance count and size.
   const uint16_t header[] = {
       1, 0, 16, 2, fvar.axisCount, 20, static_cast<uint16_t>(fvar.instances.size()), instanceSize};
   for (uint16_t value : header) {
@@ -159,8 +158,7 @@ std::vector<uint8_t> SfntFont::build(uint32_t fontOffset) const {
   std::stable_sort(order.begin(), order.end(),
                    [&](size_t a, size_t b) { return tables[a].tag < tables[b].tag; });
 
-  // The offset table (search fields left zero: the reader does not use them),
-  // the records, the tables.
+  // The offset table (search fields left zero: the reader does not use them), records, tables.
   std::vector<uint8_t> file;
   appendU32(file, sfntVersion_);
   appendU16(file, static_cast<uint16_t>(tables.size()));
