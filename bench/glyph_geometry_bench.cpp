@@ -1,14 +1,12 @@
 // Times outline building (conversion, flattening, loops and containment tree) plus
 // triangulation for every glyph of a font at 48 pixels: the total and the slowest glyph.
 //   glyph_geometry_bench [FONT_FILE]   (default: DejaVu Sans)
-#include <ft2build.h>
-#include FT_FREETYPE_H
-
 #include <chrono>
 #include <cstdio>
 #include <string>
 
 #include "fonts/glyph_conversion.h"
+#include "freetype_face.h"
 #include "geometry/character_outline.h"
 #include "geometry/triangulate_pieces.h"
 
@@ -24,13 +22,11 @@ double millisecondsSince(Clock::time_point start) {
 
 int main(int argc, char** argv) {
   const std::string path = argc > 1 ? argv[1] : "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
-  FT_Library library = nullptr;
-  FT_Face face = nullptr;
-  if (FT_Init_FreeType(&library) != 0 || FT_New_Face(library, path.c_str(), 0, &face) != 0) {
+  const waveform_test::FreeTypeFace face(path, 0, 48);
+  if (face.get() == nullptr) {
     std::fprintf(stderr, "glyph_geometry_bench: cannot open %s\n", path.c_str());
     return 1;
   }
-  FT_Set_Pixel_Sizes(face, 0, 48);
   const std::u16string filePath(path.begin(), path.end());
   double total = 0;
   double conversion = 0;
@@ -40,7 +36,7 @@ int main(int argc, char** argv) {
   for (FT_Long glyph = 0; glyph < face->num_glyphs; ++glyph) {
     const Clock::time_point start = Clock::now();
     const vesk::plugin::lib::GlyphDescriptor descriptor =
-        vesk::plugin::lib::convertGlyph(face, static_cast<uint32_t>(glyph), 48, filePath, 0);
+        vesk::plugin::lib::convertGlyph(face.get(), static_cast<uint32_t>(glyph), 48, filePath, 0);
     conversion += millisecondsSince(start);
     const auto outline = qvtl::geometry::makeCharacterOutline(descriptor, {});
     qvtl::geometry::triangulatePieces(*outline);
@@ -57,7 +53,5 @@ int main(int argc, char** argv) {
   std::printf(
       "total %.1f ms (FreeType loading and conversion %.1f ms), slowest glyph %ld: %.3f ms\n",
       total, conversion, slowestGlyph, slowest);
-  FT_Done_Face(face);
-  FT_Done_FreeType(library);
   return 0;
 }

@@ -28,39 +28,21 @@ void check(bool holds) {
 
 size_t sink = 0;
 
-void use(const std::string& text) {
-  sink += text.size();
-}
-void use(const std::u16string& text) {
-  sink += text.size();
-}
-void use(FontVector value) {
-  sink += static_cast<size_t>(value[0] != value[1]);
-}
-void use(float value) {
-  sink += static_cast<size_t>(value > 0);
-}
-
 void askEverything(const FontFileReader& reader, int32_t face) {
-  use(reader.subfamilyName(face));
-  use(reader.fullName(face));
-  use(reader.postScriptName(face));
-  use(reader.familyName(face));
-  use(reader.styleName(face));
-  use(reader.sampleText(face));
-  use(reader.subfamilyNameUtf16(face));
-  use(reader.fullNameUtf16(face));
-  use(reader.postScriptNameUtf16(face));
-  use(reader.familyNameUtf16(face));
-  use(reader.styleNameUtf16(face));
-  use(reader.subscriptSize(face));
-  use(reader.subscriptOffset(face));
-  use(reader.superscriptSize(face));
-  use(reader.superscriptOffset(face));
-  use(reader.strikeoutSize(face));
-  use(reader.strikeoutPosition(face));
-  use(reader.underlinePosition(face));
-  use(reader.underlineThickness(face));
+  for (const std::u16string& text : {reader.subfamilyNameUtf16(face), reader.fullNameUtf16(face),
+                                     reader.postScriptNameUtf16(face), reader.familyNameUtf16(face),
+                                     reader.styleNameUtf16(face)}) {
+    sink += text.size();
+  }
+  sink += reader.styleName(face).size() + reader.sampleText(face).size();
+  for (const FontVector& value : {reader.subscriptSize(face), reader.subscriptOffset(face),
+                                  reader.superscriptSize(face), reader.superscriptOffset(face)}) {
+    sink += static_cast<size_t>(value[0] != value[1]);
+  }
+  for (float value : {reader.strikeoutSize(face), reader.strikeoutPosition(face),
+                      reader.underlinePosition(face), reader.underlineThickness(face)}) {
+    sink += static_cast<size_t>(value > 0);
+  }
   sink += reader.isEmbeddable(face);
 
   check(reader.postScriptName(face).empty() ==
@@ -76,8 +58,7 @@ void askEverything(const FontFileReader& reader, int32_t face) {
     }
   }
   for (const NamedInstance& instance : reader.namedInstances(face)) {
-    use(instance.subfamilyName);
-    use(instance.postScriptName);
+    sink += instance.subfamilyName.size() + instance.postScriptName.size();
     check(instance.postScriptNameID != 0 || instance.postScriptName.empty());
   }
 }

@@ -15,11 +15,17 @@
 #include <vector>
 
 #include "geometry/triangulation.h"
+#include "polygon_area.h"
 
 namespace {
 
 using qvtl::geometry::Point2f;
 using qvtl::geometry::PointList;
+using waveform_test::signedArea;
+
+bool inside(const PointList& ring, const Point2f& p) {
+  return waveform_test::insideRing(ring, p.x, p.y);
+}
 
 struct Reader {
   const uint8_t* data;
@@ -28,80 +34,14 @@ struct Reader {
   uint8_t next() { return at < size ? data[at++] : 0; }
 };
 
-int64_t orient(const Point2f& a, const Point2f& b, const Point2f& c) {
-  const int64_t v = static_cast<int64_t>(b.x - a.x) * static_cast<int64_t>(c.y - a.y) -
-                    static_cast<int64_t>(b.y - a.y) * static_cast<int64_t>(c.x - a.x);
-  return (v > 0) - (v < 0);
-}
-bool onSegment(const Point2f& a, const Point2f& b, const Point2f& q) {
-  return orient(a, b, q) == 0 && std::fmin(a.x, b.x) <= q.x && q.x <= std::fmax(a.x, b.x) &&
-         std::fmin(a.y, b.y) <= q.y && q.y <= std::fmax(a.y, b.y);
-}
-// Closed segments share at least one point.
-bool touch(const Point2f& a, const Point2f& b, const Point2f& c, const Point2f& d) {
-  const int64_t o1 = orient(a, b, c), o2 = orient(a, b, d), o3 = orient(c, d, a),
-                o4 = orient(c, d, b);
-  if (o1 != o2 && o3 != o4 && o1 != 0 && o2 != 0 && o3 != 0 && o4 != 0) {
-    return true;
-  }
-  return onSegment(a, b, c) || onSegment(a, b, d) || onSegment(c, d, a) || onSegment(c, d, b);
-}
-
-double area(const PointList& ring) {
-  double sum = 0;
-  for (size_t i = 0; i < ring.size(); ++i) {
-    const Point2f& a = ring[i];
-    const Point2f& b = ring[(i + 1) % ring.size()];
-    sum += static_cast<double>(a.x) * b.y - static_cast<double>(b.x) * a.y;
-  }
-  return sum * 0.5;
-}
-
+// Simple, with room to spare, and of some area. (On this integer grid, segments that do not
+// touch are more than the room apart.)
 bool simple(const PointList& ring) {
-  const size_t n = ring.size();
-  for (size_t i = 0; i < n; ++i) {
-    const Point2f& a = ring[i];
-    const Point2f& b = ring[(i + 1) % n];
-    if (a == b) {
-      return false;
-    }
-    // Consecutive edges meet only at their shared point.
-    const Point2f& c = ring[(i + 2) % n];
-    if (orient(a, b, c) == 0 && (c.x - b.x) * (a.x - b.x) + (c.y - b.y) * (a.y - b.y) > 0) {
-      return false;
-    }
-    for (size_t j = i + 2; j < n; ++j) {
-      if ((j + 1) % n == i) {
-        continue;
-      }
-      if (touch(a, b, ring[j], ring[(j + 1) % n])) {
-        return false;
-      }
-    }
-  }
-  return area(ring) != 0;
+  return waveform_test::isSimple(ring) && signedArea(ring) != 0;
 }
 
 bool ringsTouch(const PointList& r, const PointList& s) {
-  for (size_t i = 0; i < r.size(); ++i) {
-    for (size_t j = 0; j < s.size(); ++j) {
-      if (touch(r[i], r[(i + 1) % r.size()], s[j], s[(j + 1) % s.size()])) {
-        return true;
-      }
-    }
-  }
-  return false;
-}
-
-bool inside(const PointList& ring, const Point2f& p) {
-  bool in = false;
-  for (size_t i = 0, j = ring.size() - 1; i < ring.size(); j = i++) {
-    const double xi = ring[i].x, yi = ring[i].y, xj = ring[j].x, yj = ring[j].y;
-    if ((yi > p.y) != (yj > p.y) && p.x < (xj - xi) * (p.y - yi) / (yj - yi) + xi) {
-      in = !in;
-    }
-  }
-  return in;
+  return !waveform_test::ringsApart(r, s);
 }
 
 PointList readRing(Reader& reader, bool byAngle, int range, float x0, float y0) {
@@ -168,15 +108,15 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   if (!valid(outer, holes)) {
     return 0;
   }
-  double expected = std::fabs(area(outer));
+  double expected = std::fabs(signedArea(outer));
   for (const PointList& hole : holes) {
-    expected -= std::fabs(area(hole));
+    expected -= std::fabs(signedArea(hole));
   }
-  double covered = 0;
+  std::vector<uint32_t> indices;
   for (const auto& t : result.triangles) {
-    covered +=
-        std::fabs(area({result.vertices[t[0]], result.vertices[t[1]], result.vertices[t[2]]}));
+    indices.insert(indices.end(), t.begin(), t.end());
   }
+  const double covered = waveform_test::trianglesArea(result.vertices, indices);
   if (std::getenv("POLYGON_FUZZ_VERBOSE") != nullptr) {
     std::fprintf(stderr, "valid: %zu holes, %zu outer points, covered %f, expected %f\n",
                  holes.size(), outer.size(), covered, expected);

@@ -12,35 +12,15 @@
 namespace {
 
 using waveform_test::buildCollection;
-using waveform_test::FvarAxis;
-using waveform_test::FvarInstance;
-using waveform_test::FvarTable;
 using waveform_test::namedFont;
 using waveform_test::Os2Fields;
 using waveform_test::SfntFont;
+using waveform_test::variableFont;
 
 // The first byte of a seed: the extension (0 .ttf, 2 .ttc) plus 6 times the language index
 // (0 English, 1 German, 2 Simplified Chinese, 3 Hong Kong Chinese).
-constexpr uint8_t kTtf = 0;
-constexpr uint8_t kTtc = 2;
-constexpr uint8_t kGermanUser = 6;
-constexpr uint8_t kChineseUser = 12;
-constexpr uint8_t kHongKongUser = 18;
-
-SfntFont variableFont(bool postScriptNameIDs) {
-  FvarTable fvar;
-  fvar.axes = {FvarAxis{"wght", 100, 400, 900, 256}, FvarAxis{"wdth", 75, 100, 100, 257}};
-  fvar.instances = {FvarInstance{258, 300, {400, 100}}, FvarInstance{259, 301, {700, 75}}};
-  fvar.postScriptNameIDs = postScriptNameIDs;
-  SfntFont font = namedFont(u"Var", u"Regular", u"Var Regular", u"Var-Regular");
-  font.setFvar(fvar)
-      .addName(3, 1033, 258, u"Regular")
-      .addName(3, 1033, 259, u"Bold Condensed")
-      .addName(3, 1031, 259, u"Fett Schmal")
-      .addName(3, 1033, 300, u"Var-Regular")
-      .addName(3, 1033, 301, u"Var-BoldCondensed");
-  return font;
-}
+constexpr uint8_t kTtf = 0, kTtc = 2;
+constexpr uint8_t kLanguages[] = {0, 6, 12, 18};
 
 SfntFont multilingualFont() {
   SfntFont font;
@@ -63,7 +43,13 @@ SfntFont multilingualFont() {
   return font;
 }
 
-std::vector<std::pair<std::string, std::vector<uint8_t>>> seeds() {
+struct Seed {
+  std::string name;
+  std::vector<uint8_t> font;
+  uint8_t extension;
+};
+
+std::vector<Seed> seeds() {
   const SfntFont plain = namedFont(u"Plain", u"Regular", u"Plain Regular", u"Plain-Regular");
   const SfntFont bold = namedFont(u"Plain", u"Bold", u"Plain Bold", u"Plain-Bold");
   SfntFont odd = namedFont(u"Odd", u"Italic", u"Odd Italic", u"Odd-Italic");
@@ -72,24 +58,14 @@ std::vector<std::pair<std::string, std::vector<uint8_t>>> seeds() {
       .addNameBytes(3, 1, 1033, 2, {0xD8, 0x00, 0x00, 0x41})
       .setTrailingBytes({0xDE, 0xAD, 0xBE, 0xEF});
   return {
-      {"plain-ttf", plain.build()},
-      {"variable-with-postscript-ids", variableFont(true).build()},
-      {"variable-without-postscript-ids", variableFont(false).build()},
-      {"multilingual", multilingualFont().build()},
-      {"odd-tables", odd.build()},
-      {"collection", buildCollection({plain, bold, variableFont(true)})},
-      {"collection-as-ttf", buildCollection({multilingualFont(), plain})},
+      {"plain-ttf", plain.build(), kTtf},
+      {"variable-with-postscript-ids", variableFont(true).build(), kTtf},
+      {"variable-without-postscript-ids", variableFont(false).build(), kTtf},
+      {"multilingual", multilingualFont().build(), kTtf},
+      {"odd-tables", odd.build(), kTtf},
+      {"collection", buildCollection({plain, bold, variableFont(true)}), kTtc},
+      {"collection-as-ttf", buildCollection({multilingualFont(), plain}), kTtf},
   };
-}
-
-bool write(const std::filesystem::path& path, uint8_t selector, const std::vector<uint8_t>& font) {
-  std::FILE* file = std::fopen(path.c_str(), "wb");
-  if (!file) {
-    return false;
-  }
-  bool written = std::fputc(selector, file) != EOF;
-  written = written && std::fwrite(font.data(), 1, font.size(), file) == font.size();
-  return std::fclose(file) == 0 && written;
 }
 
 }  // namespace
@@ -102,12 +78,12 @@ int main(int argc, char** argv) {
   const std::filesystem::path folder = argv[1];
   std::filesystem::create_directories(folder);
   int count = 0;
-  for (const auto& [name, font] : seeds()) {
-    const bool collection = name.rfind("collection", 0) == 0 && name != "collection-as-ttf";
-    const uint8_t extension = collection ? kTtc : kTtf;
-    for (uint8_t language : {uint8_t{0}, kGermanUser, kChineseUser, kHongKongUser}) {
-      const auto path = folder / (name + "-" + std::to_string(language));
-      if (!write(path, static_cast<uint8_t>(extension + language), font)) {
+  for (const Seed& seed : seeds()) {
+    for (uint8_t language : kLanguages) {
+      const auto path = folder / (seed.name + "-" + std::to_string(language));
+      std::vector<uint8_t> bytes = {static_cast<uint8_t>(seed.extension + language)};
+      bytes.insert(bytes.end(), seed.font.begin(), seed.font.end());
+      if (!waveform_test::writeFile(path.string(), bytes)) {
         std::fprintf(stderr, "cannot write %s\n", path.c_str());
         return 1;
       }

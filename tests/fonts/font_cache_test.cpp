@@ -4,13 +4,14 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <filesystem>
-#include <fstream>
 #include <map>
+#include <set>
 #include <string>
 #include <vector>
 
+#include "ci_or_skip.h"
+#include "platform/utf16_text.h"
 #include "sfnt_writer.h"
 
 namespace waveform_test {
@@ -22,19 +23,14 @@ using platform::InstalledFont;
 using vesk::project::FontCache;
 using vesk::project::FontRecord;
 
-std::u16string utf16(const std::string& ascii) {
-  return std::u16string(ascii.begin(), ascii.end());
-}
-
-std::string ascii(const std::u16string& text) {
-  return std::string(text.begin(), text.end());
-}
+using platform::toUtf16;
+using platform::toUtf8;
 
 // A system whose fonts the test chooses.
 class FakeSystem : public platform::SystemServices {
  public:
   std::optional<std::u16string> folder;
-  std::map<FontHive, std::optional<std::vector<InstalledFont>>> lists;
+  std::map<FontHive, std::vector<InstalledFont>> lists;
   std::vector<EnumeratedFace> faces;
   mutable std::vector<std::u16string> askedFaceNames;  // by the second enumeration pass
 
@@ -45,12 +41,9 @@ class FakeSystem : public platform::SystemServices {
   }
   std::vector<EnumeratedFace> enumerateFamilies() const override {
     std::vector<EnumeratedFace> families;
+    std::set<std::u16string> seen;
     for (const EnumeratedFace& face : faces) {
-      bool known = false;
-      for (const EnumeratedFace& family : families) {
-        known = known || family.faceName == face.faceName;
-      }
-      if (!known) {
+      if (seen.insert(face.faceName).second) {
         families.push_back(face);
       }
     }
@@ -83,7 +76,7 @@ class FontCacheOnFakeSystem : public testing::Test {
     std::filesystem::remove_all(root_);
     std::filesystem::create_directories(root_ / "fonts");
     system_ = std::make_shared<FakeSystem>();
-    system_->folder = utf16((root_ / "fonts").string() + "/");
+    system_->folder = toUtf16((root_ / "fonts").string() + "/");
   }
   void TearDown() override { std::filesystem::remove_all(root_); }
 
@@ -96,17 +89,11 @@ class FontCacheOnFakeSystem : public testing::Test {
   std::u16string writeBytes(const std::string& relativePath, const std::vector<uint8_t>& bytes) {
     const std::filesystem::path path = root_ / relativePath;
     std::filesystem::create_directories(path.parent_path());
-    std::ofstream(path, std::ios::binary)
-        .write(reinterpret_cast<const char*>(bytes.data()),
-               static_cast<std::streamsize>(bytes.size()));
-    return utf16(path.string());
+    EXPECT_TRUE(writeFile(path.string(), bytes));
+    return toUtf16(path.string());
   }
   void install(FontHive hive, const std::u16string& name, const std::u16string& file) {
-    auto& list = system_->lists[hive];
-    if (!list) {
-      list.emplace();
-    }
-    list->push_back({name, file});
+    system_->lists[hive].push_back({name, file});
   }
   void enumerate(const std::u16string& family, const std::u16string& style,
                  const std::u16string& fullName, int32_t type = platform::kTrueTypeFontType) {
@@ -117,9 +104,9 @@ class FontCacheOnFakeSystem : public testing::Test {
     for (const std::u16string& style : styles) {
       const std::u16string postScript = family + u"-" + style;
       const std::u16string full = family + u" " + style;
-      const std::string file = ascii(postScript) + ".ttf";
+      const std::string file = toUtf8(postScript) + ".ttf";
       writeFont("fonts/" + file, family, style, full, postScript);
-      install(FontHive::kMachine, full + u" (TrueType)", utf16(file));
+      install(FontHive::kMachine, full + u" (TrueType)", toUtf16(file));
       enumerate(family, style, full);
     }
   }
@@ -150,7 +137,7 @@ TEST(FontCacheNames, FileNamesResolveAgainstTheFontsFolder) {
       {u"sub/dir/y.otf", u"/fonts/sub/dir/y.otf"},
   };
   for (const auto& [file, path] : cases) {
-    EXPECT_EQ(resolveFontFile(folder, file), path) << ascii(file);
+    EXPECT_EQ(resolveFontFile(folder, file), path) << toUtf8(file);
   }
 }
 
@@ -202,13 +189,10 @@ TEST_F(FontCacheOnFakeSystem, NamesComeFromTheFileAndPathsResolve) {
 
 TEST_F(FontCacheOnFakeSystem, NamedInstancesOfAVariableFontAreFacesOfTheirOwn) {
   SfntFont font = namedFont(u"Var Sans", u"Regular", u"Var Sans Regular", u"VarSans-Regular");
-  font.addName(3, 1033, 257, u"Light").addName(3, 1033, 258, u"Bold");
-  font.addName(3, 1033, 259, u"VarSans-BoldInstance");
-  FvarTable fvar;
-  fvar.axes.push_back({});
-  fvar.instances = {{257, 0, {300}}, {258, 259, {700}}};
-  fvar.postScriptNameIDs = true;
-  font.setFvar(fvar);
+  font.addName(3, 1033, 257, u"Light")
+      .addName(3, 1033, 258, u"Bold")
+      .addName(3, 1033, 259, u"VarSans-BoldInstance")
+      .setFvar({1, {{257, 0}, {258, 259}}, true});
   writeBytes("fonts/var.ttf", font.build());
   install(FontHive::kMachine, u"Var Sans (TrueType)", u"var.ttf");
   enumerate(u"Var Sans", u"Regular", u"Var Sans Regular");
@@ -271,7 +255,7 @@ TEST_F(FontCacheOnFakeSystem, LookupsTryPostScriptThenFullNamesThenFamily) {
   };
   for (const Case& c : cases) {
     EXPECT_EQ(cache.findFont(c.postScript, c.family, c.full).postScriptName, c.expected)
-        << ascii(c.postScript) << " / " << ascii(c.family) << " / " << ascii(c.full);
+        << toUtf8(c.postScript) << " / " << toUtf8(c.family) << " / " << toUtf8(c.full);
   }
 }
 
@@ -329,19 +313,14 @@ TEST_F(FontCacheOnFakeSystem, LongFamilyNamesAreEnumeratedByTheirFirst31Units) {
   EXPECT_EQ(system_->askedFaceNames, std::vector<std::u16string>{family.substr(0, 31)});
 }
 
-TEST_F(FontCacheOnFakeSystem, NothingInstalledGivesEmptyRecords) {
+TEST_F(FontCacheOnFakeSystem, NothingInstalledGivesEmptyRecordsAndNoFontsFolderAnError) {
   FontCache cache(system_);
   EXPECT_TRUE(cache.familyNames().empty());
   EXPECT_FALSE(cache.hasFont(u"Arial", u"Arial", u"Arial"));
-  const FontRecord record = cache.findFont(u"Arial", u"Arial", u"Arial");
-  EXPECT_TRUE(record.postScriptName.empty());
-  EXPECT_TRUE(record.filePath.empty());
-}
-
-TEST_F(FontCacheOnFakeSystem, NoFontsFolderIsAnError) {
+  EXPECT_EQ(cache.findFont(u"Arial", u"Arial", u"Arial").filePath, u"");
   system_->folder.reset();
   try {
-    FontCache cache(system_);
+    FontCache failing(system_);
     FAIL() << "expected an error";
   } catch (const std::runtime_error& error) {
     EXPECT_STREQ(error.what(), "Cannot get system fonts path");
@@ -351,24 +330,18 @@ TEST_F(FontCacheOnFakeSystem, NoFontsFolderIsAnError) {
 // This machine's catalogue through fontconfig: every DejaVu face by each of its names.
 TEST(FontCacheOnThisMachine, EveryDejaVuFaceIsFoundByEachOfItsNames) {
   const std::filesystem::path folder = "/usr/share/fonts/truetype/dejavu";
-  if (!std::filesystem::exists(folder)) {
-    const char* ci = std::getenv("CI");
-    if (ci != nullptr && std::string(ci) == "true") {
-      FAIL() << "fonts-dejavu-core is not installed";
-    }
-    GTEST_SKIP() << "fonts-dejavu-core is not installed";
-  }
+  REQUIRE_FILE(folder);
   FontCache cache(platform::systemServices());
   const std::set<std::u16string> families = cache.familyNames();
   int faces = 0;
   for (const auto& entry : std::filesystem::directory_iterator(folder)) {
-    const vesk::project::FontFileReader reader(utf16(entry.path().string()), 0x0409);
+    const vesk::project::FontFileReader reader(toUtf16(entry.path().string()), 0x0409);
     for (int32_t face = 0; face < reader.faceCount(); ++face, ++faces) {
       const std::u16string postScript = reader.postScriptNameUtf16(face);
       const std::u16string full = reader.fullNameUtf16(face);
       const std::u16string family = reader.familyNameUtf16(face);
       const std::string what = entry.path().string();
-      EXPECT_EQ(cache.findFont(postScript, u"", u"").filePath, utf16(entry.path().string()))
+      EXPECT_EQ(cache.findFont(postScript, u"", u"").filePath, toUtf16(entry.path().string()))
           << what;
       EXPECT_EQ(cache.findFont(u"", u"", full).postScriptName, postScript) << what;
       EXPECT_EQ(cache.findFont(u"x", family, u"y").familyName, family) << what;

@@ -2,22 +2,15 @@
 
 #include <algorithm>
 #include <cmath>
-#include <functional>
 
 #include "geometry/qv_shape.h"
+#include "polygon_area.h"
 
 namespace qvtl::geometry {
 namespace {
 
-// Counter-clockwise square (y up) with corners (x0, y0) and (x1, y1).
-PointList square(float x0, float y0, float x1, float y1) {
-  return {{x0, y0}, {x1, y0}, {x1, y1}, {x0, y1}};
-}
-
-PointList reversed(PointList points) {
-  std::reverse(points.begin(), points.end());
-  return points;
-}
+using waveform_test::reversed;
+using waveform_test::square;
 
 size_t depthOf(const Shape2f& node) {
   size_t depth = 0;
@@ -26,15 +19,17 @@ size_t depthOf(const Shape2f& node) {
   return depth;
 }
 
-void expectAllIds(const Shape2f& node, uint32_t id, size_t& count) {
+// The loops below `node`, each checked to carry `id` unless that is 0.
+size_t loopsBelow(const Shape2f& node, uint32_t id = 0) {
+  size_t count = 0;
   for (const Shape2f& child : node.children) {
-    EXPECT_EQ(child.path.id, id);
-    ++count;
-    expectAllIds(child, id, count);
+    EXPECT_TRUE(id == 0 || child.path.id == id);
+    count += 1 + loopsBelow(child, id);
   }
+  return count;
 }
 
-TEST(ShapesTest, LetterOIsOuterWithItsHole) {
+TEST(Shapes, LetterOIsOuterWithItsHole) {
   Shape2f shape;
   addPath(shape, makePath(square(0, 0, 10, 10), 1));
   addPath(shape, makePath(reversed(square(3, 3, 7, 7)), 2));
@@ -45,15 +40,10 @@ TEST(ShapesTest, LetterOIsOuterWithItsHole) {
   EXPECT_EQ(outer.children[0].path.id, 2u);
   EXPECT_EQ(outer.children[0].path.orientation, kClockwise);
 
-  const std::vector<const Shape2f*> pieces = collectFilledPieces(shape);
-  ASSERT_EQ(pieces.size(), 1u);
-  EXPECT_EQ(pieces[0], &outer);
-  const std::vector<PointList> holes = pieceHoles(outer);
-  ASSERT_EQ(holes.size(), 1u);
-  EXPECT_EQ(holes[0], outer.children[0].path.points);
+  EXPECT_EQ(collectFilledPieces(shape), std::vector<const Shape2f*>{&outer});
 }
 
-TEST(ShapesTest, ContainmentDoesNotDependOnInsertionOrder) {
+TEST(Shapes, ContainmentDoesNotDependOnInsertionOrder) {
   for (const bool innerFirst : {false, true}) {
     Shape2f shape;
     const Path2f outer = makePath(square(0, 0, 10, 10), 1);
@@ -70,7 +60,7 @@ TEST(ShapesTest, ContainmentDoesNotDependOnInsertionOrder) {
   }
 }
 
-TEST(ShapesTest, ContainsPath) {
+TEST(Shapes, ContainsPath) {
   const Path2f outer = makePath(square(0, 0, 10, 10));
   struct Case {
     const char* name;
@@ -92,7 +82,7 @@ TEST(ShapesTest, ContainsPath) {
   EXPECT_FALSE(containsPath(Path2f{}, outer, true));
 }
 
-TEST(ShapesTest, FigureEightSplitsAtItsCrossing) {
+TEST(Shapes, FigureEightSplitsAtItsCrossing) {
   Shape2f shape;
   addPath(shape, makePath({{0, 0}, {2, 2}, {2, 0}, {0, 2}}, 5));
   ASSERT_EQ(shape.children.size(), 2u);
@@ -108,7 +98,7 @@ TEST(ShapesTest, FigureEightSplitsAtItsCrossing) {
   EXPECT_EQ(bounds[1], (std::array<float, 4>{1, 0, 2, 2}));
 }
 
-TEST(ShapesTest, ClockwiseLoopsKeepTheirDirectionAfterSplitting) {
+TEST(Shapes, ClockwiseLoopsKeepTheirDirectionAfterSplitting) {
   // A clockwise square whose right side makes a crossed loop outward.
   const PointList points = reversed({{0, 0}, {4, 0}, {4, 1}, {6, 3}, {6, 2}, {4, 4}, {0, 4}});
   const std::vector<Path2f> loops = splitSelfIntersections(makePath(points, 3));
@@ -122,7 +112,7 @@ TEST(ShapesTest, ClockwiseLoopsKeepTheirDirectionAfterSplitting) {
   EXPECT_EQ(big.bounds, (std::array<float, 4>{0, 0, 5.5f, 4}));
 }
 
-TEST(ShapesTest, RevisitedPointSplitsIntoTwoLoops) {
+TEST(Shapes, RevisitedPointSplitsIntoTwoLoops) {
   const PointList points{{0, 0}, {1, 0}, {1, 1}, {2, 1}, {2, 2}, {1, 2}, {1, 1}, {0, 1}};
   Path2f path;
   path.points = points;
@@ -141,7 +131,7 @@ TEST(ShapesTest, RevisitedPointSplitsIntoTwoLoops) {
   EXPECT_EQ(shape.children.size(), 2u);
 }
 
-TEST(ShapesTest, FlipOrientationTurnsTheWholeSubtree) {
+TEST(Shapes, FlipOrientationTurnsTheWholeSubtree) {
   Shape2f shape;
   addPath(shape, makePath(reversed(square(0, 0, 10, 10)), 1));
   addPath(shape, makePath(square(3, 3, 7, 7), 2));
@@ -156,7 +146,7 @@ TEST(ShapesTest, FlipOrientationTurnsTheWholeSubtree) {
   EXPECT_EQ(computeOrientation(outer.children[0].children[0].path), kCounterClockwise);
 }
 
-TEST(ShapesTest, HolesOfAPiece) {
+TEST(Shapes, HolesOfAPiece) {
   Shape2f piece;
   piece.path = makePath(square(0, 0, 10, 10), 1);
   const Path2f clockwiseChild = makePath(reversed(square(1, 1, 2, 2)), 2);
@@ -165,17 +155,15 @@ TEST(ShapesTest, HolesOfAPiece) {
   for (const Path2f& child : {clockwiseChild, otherIdChild, sameIdChild}) {
     piece.children.push_back(Shape2f{child, {}});
   }
-  const std::vector<PointList> holes = pieceHoles(piece);
-  ASSERT_EQ(holes.size(), 2u);
-  EXPECT_EQ(holes[0], clockwiseChild.points);
-  EXPECT_EQ(holes[1], reversed(otherIdChild.points));
+  EXPECT_EQ(pieceHoles(piece),
+            (std::vector<PointList>{clockwiseChild.points, reversed(otherIdChild.points)}));
   // Children are visited before their parent; the clockwise child is not filled.
   const std::vector<const Shape2f*> pieces = collectFilledPieces(piece);
   ASSERT_EQ(pieces.size(), 3u);
   EXPECT_EQ(pieces.back(), &piece);
 }
 
-TEST(ShapesTest, DegenerateContoursContributeNoPiece) {
+TEST(Shapes, DegenerateContoursContributeNoPiece) {
   const float nan = std::nanf("");
   const PointList inputs[] = {
       {},
@@ -192,7 +180,7 @@ TEST(ShapesTest, DegenerateContoursContributeNoPiece) {
   }
 }
 
-TEST(ShapesTest, StarCrossingItselfThousandsOfTimesIsSplitWithinBounds) {
+TEST(Shapes, StarCrossingItselfThousandsOfTimesIsSplitWithinBounds) {
   constexpr int kPoints = 2000;
   PointList star;
   for (int i = 0; i < kPoints; ++i) {
@@ -202,14 +190,13 @@ TEST(ShapesTest, StarCrossingItselfThousandsOfTimesIsSplitWithinBounds) {
   }
   Shape2f shape;
   addPath(shape, makePath(star, 9));
-  size_t count = 0;
-  expectAllIds(shape, 9, count);
+  const size_t count = loopsBelow(shape, 9);
   EXPECT_GT(count, 1u);
   EXPECT_LE(count, kMaxLoopsPerPath);
   EXPECT_LE(depthOf(shape), kMaxShapeDepth);
 }
 
-TEST(ShapesTest, DeepNestingIsCapped) {
+TEST(Shapes, DeepNestingIsCapped) {
   for (const bool outsideIn : {true, false}) {
     Shape2f shape;
     constexpr int kSquares = 200;
@@ -217,14 +204,7 @@ TEST(ShapesTest, DeepNestingIsCapped) {
       const float d = static_cast<float>(outsideIn ? k : kSquares - 1 - k);
       addPath(shape, makePath(square(d, d, 1000 - d, 1000 - d), static_cast<uint32_t>(k + 1)));
     }
-    size_t count = 0;
-    std::function<void(const Shape2f&)> countAll = [&](const Shape2f& node) {
-      count += node.children.size();
-      for (const Shape2f& child : node.children)
-        countAll(child);
-    };
-    countAll(shape);
-    EXPECT_EQ(count, static_cast<size_t>(kSquares)) << outsideIn;
+    EXPECT_EQ(loopsBelow(shape), static_cast<size_t>(kSquares)) << outsideIn;
     EXPECT_EQ(depthOf(shape), kMaxShapeDepth) << outsideIn;
   }
 }

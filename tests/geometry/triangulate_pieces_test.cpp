@@ -1,22 +1,21 @@
+#include "geometry/triangulate_pieces.h"
+
 #include <gtest/gtest.h>
 
 #include <algorithm>
 #include <cmath>
 
-#include "geometry/triangulate_pieces.h"
 #include "geometry/triangulation.h"
+#include "polygon_area.h"
 
 namespace qvtl::geometry {
 namespace {
 
-PointList square(float x0, float y0, float x1, float y1) {
-  return {{x0, y0}, {x1, y0}, {x1, y1}, {x0, y1}};
-}
+using waveform_test::reversed;
+using waveform_test::square;
 
-PointList reversed(PointList points) {
-  std::reverse(points.begin(), points.end());
-  return points;
-}
+using waveform_test::signedArea;
+using waveform_test::trianglesArea;
 
 CharacterOutline outlineOf(const std::vector<PointList>& contours) {
   CharacterOutline outline;
@@ -26,51 +25,26 @@ CharacterOutline outlineOf(const std::vector<PointList>& contours) {
   return outline;
 }
 
-// Sum of the triangles' signed areas, counter-clockwise positive.
-float coveredArea(const CharacterOutline& outline) {
-  float area = 0;
-  for (size_t i = 0; i + 2 < outline.indices.size(); i += 3) {
-    const Point2f a = outline.vertices[outline.indices[i]];
-    const Point2f b = outline.vertices[outline.indices[i + 1]];
-    const Point2f c = outline.vertices[outline.indices[i + 2]];
-    area += 0.5f * ((b.x - a.x) * (c.y - a.y) - (b.y - a.y) * (c.x - a.x));
-  }
-  return area;
-}
-
-TEST(TriangulatePiecesTest, SquareGivesTwoTrianglesInReversedOrder) {
+// Each triangle of the polygon triangulation, in reversed order, and computed once.
+TEST(TriangulatePieces, SquareGivesTwoTrianglesInReversedOrderOnce) {
   CharacterOutline outline = outlineOf({square(0, 0, 1, 1)});
   triangulatePieces(outline);
   EXPECT_TRUE(outline.triangulated);
   const TriangulationResult direct = triangulatePolygon(square(0, 0, 1, 1), {}, 99999999);
   ASSERT_EQ(direct.triangles.size(), 2u);
-  ASSERT_EQ(outline.indices.size(), 6u);
-  for (size_t t = 0; t < 2; ++t) {
-    EXPECT_EQ(outline.indices[3 * t], direct.triangles[t][2]);
-    EXPECT_EQ(outline.indices[3 * t + 1], direct.triangles[t][1]);
-    EXPECT_EQ(outline.indices[3 * t + 2], direct.triangles[t][0]);
+  std::vector<uint32_t> reversedIndices;
+  for (const Triangle& t : direct.triangles) {
+    reversedIndices.insert(reversedIndices.end(), {t[2], t[1], t[0]});
   }
+  EXPECT_EQ(outline.indices, reversedIndices);
   EXPECT_EQ(outline.vertices, direct.vertices);
   EXPECT_EQ(outline.pieceIds, (std::vector<uint32_t>{1, 1}));
-  EXPECT_FLOAT_EQ(coveredArea(outline), 1);
-}
-
-TEST(TriangulatePiecesTest, CacheIsComputedOnce) {
-  CharacterOutline outline = outlineOf({square(0, 0, 1, 1)});
-  triangulatePieces(outline);
   addPath(outline.shape, makePath(square(5, 5, 6, 6), 2));
   triangulatePieces(outline);
   EXPECT_EQ(outline.indices.size(), 6u);
 }
 
-TEST(TriangulatePiecesTest, LetterOLeavesItsHoleEmpty) {
-  CharacterOutline outline = outlineOf({square(0, 0, 10, 10), reversed(square(3, 3, 7, 7))});
-  triangulatePieces(outline);
-  EXPECT_NEAR(coveredArea(outline), 100 - 16, 1e-3f);
-  EXPECT_EQ(outline.pieceIds, std::vector<uint32_t>(outline.indices.size() / 3, 1));
-}
-
-TEST(TriangulatePiecesTest, PiecesAreConcatenatedWithOffsetIndices) {
+TEST(TriangulatePieces, PiecesAreConcatenatedWithOffsetIndices) {
   CharacterOutline outline = outlineOf({square(0, 0, 1, 1), square(5, 0, 7, 1)});
   triangulatePieces(outline);
   ASSERT_EQ(outline.vertices.size(), 8u);
@@ -84,13 +58,13 @@ TEST(TriangulatePiecesTest, PiecesAreConcatenatedWithOffsetIndices) {
       EXPECT_LT(outline.indices[3 * t + k], firstVertex + 4);
     }
   }
-  EXPECT_FLOAT_EQ(coveredArea(outline), 3);
+  EXPECT_NEAR(trianglesArea(outline.vertices, outline.indices), 3, 1e-6);
 }
 
 // Found by fuzzing: a long thin contour whose end turns back by a tenth of a degree. Cleaning
 // may treat that turn as a spike and drop its point when the loop is cut; whatever loop the
 // shape keeps, the fill covers it exactly once.
-TEST(TriangulatePiecesTest, HairlineSpikeIsCleanedAwayAndTheRestCoveredOnce) {
+TEST(TriangulatePieces, HairlineSpikeIsCleanedAwayAndTheRestCoveredOnce) {
   const PointList thin = {{32.79f, -0.99f},
                           {22.36f, -0.96f},
                           {10.71f, -0.91f},
@@ -112,19 +86,13 @@ TEST(TriangulatePiecesTest, HairlineSpikeIsCleanedAwayAndTheRestCoveredOnce) {
   CharacterOutline outline = outlineOf({reversed(thin)});
   const std::vector<const Shape2f*> pieces = collectFilledPieces(outline.shape);
   ASSERT_EQ(pieces.size(), 1u);
-  const PointList& loop = pieces[0]->path.points;
-  EXPECT_GE(loop.size(), thin.size() - 1);
-  float loopArea = 0;
-  for (size_t i = 0; i < loop.size(); ++i) {
-    const Point2f a = loop[i];
-    const Point2f b = loop[(i + 1) % loop.size()];
-    loopArea += 0.5f * (a.x * b.y - b.x * a.y);
-  }
+  EXPECT_GE(pieces[0]->path.points.size(), thin.size() - 1);
+  const double loopArea = std::fabs(signedArea(pieces[0]->path.points));
   triangulatePieces(outline);
-  EXPECT_NEAR(std::fabs(coveredArea(outline)), std::fabs(loopArea), 1e-3f * std::fabs(loopArea));
+  EXPECT_NEAR(trianglesArea(outline.vertices, outline.indices), loopArea, 1e-3 * loopArea);
 }
 
-TEST(TriangulatePiecesTest, NoPieceGivesAnEmptyFilledCache) {
+TEST(TriangulatePieces, NoPieceGivesAnEmptyFilledCache) {
   CharacterOutline outline = outlineOf({{{0, 0}, {1, 1}}, {{0, 0}, {1, 0}, {2, 0}}});
   triangulatePieces(outline);
   EXPECT_TRUE(outline.triangulated);

@@ -1,8 +1,6 @@
 #include "gl_test_context.h"
 
-#include <cstdlib>
-#include <cstring>
-
+#include "ci_or_skip.h"
 #include "headless_gl.h"
 
 namespace waveform_test {
@@ -20,11 +18,7 @@ void GlTest::SetUp() {
   if (failure.empty()) {
     return;
   }
-  const char* ci = std::getenv("CI");
-  if (ci != nullptr && std::strcmp(ci, "true") == 0) {
-    FAIL() << "GL is required under CI: " << failure;
-  }
-  GTEST_SKIP() << "no GL: " << failure;
+  CI_OR_SKIP("no GL: " << failure);
 }
 
 }  // namespace waveform_test

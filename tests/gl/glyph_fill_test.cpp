@@ -7,11 +7,10 @@
 
 #include <algorithm>
 #include <cstdio>
-#include <cstdlib>
-#include <filesystem>
 #include <string>
 #include <vector>
 
+#include "ci_or_skip.h"
 #include "fonts/glyph_conversion.h"
 #include "geometry/character_outline.h"
 #include "gl/effect_data.h"
@@ -96,11 +95,7 @@ std::vector<uint8_t> fillOnGpu(FT_Face face, uint32_t glyph, const FT_Bitmap& bi
 
 TEST_F(GlyphFill, LettersAndDigitsCoverWhatFreeTypeRenders) {
   const std::string path = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
-  if (!std::filesystem::exists(path)) {
-    const char* ci = std::getenv("CI");
-    ASSERT_FALSE(ci != nullptr && std::string(ci) == "true") << path << " is not installed";
-    GTEST_SKIP() << path << " is not installed";
-  }
+  REQUIRE_FILE(path);
   FT_Library library = nullptr;
   FT_Face face = nullptr;
   ASSERT_EQ(FT_Init_FreeType(&library), 0);

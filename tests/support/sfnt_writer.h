@@ -1,6 +1,6 @@
-// Writes small synthetic TrueType/OpenType files and collections for tests: name tables with
-// records on any platform and language, OS/2, 'post', 'head' and 'fvar' tables, and arbitrary
-// extra tables or bytes. Nothing else a real font needs (glyphs, cmap) is written.
+// Writes small synthetic TrueType/OpenType files and collections for tests and fuzz seeds: name
+// tables with records on any platform and language, OS/2, 'post', 'head' and 'fvar' tables, and
+// arbitrary extra tables or bytes. Nothing else a real font needs (glyphs, cmap) is written.
 //
 //   SfntFont font;
 //   font.addName(3, 1033, 4, u"Foo Bold").setHead(1000, 800);
@@ -11,13 +11,13 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace waveform_test {
 
 // The OS/2 fields the font reader uses, in font units; the rest of the table is written as zero.
 struct Os2Fields {
-  uint16_t version = 4;
   uint16_t fsType = 0;
   int16_t subscriptXSize = 650;
   int16_t subscriptYSize = 600;
@@ -31,93 +31,75 @@ struct Os2Fields {
   int16_t strikeoutPosition = 300;
 };
 
-struct FvarAxis {
-  std::string tag = "wght";  // four characters
-  float minimum = 100;
-  float defaultValue = 400;
-  float maximum = 900;
-  uint16_t nameID = 256;
-};
-
-struct FvarInstance {
-  uint16_t subfamilyNameID = 0;
-  uint16_t postScriptNameID = 0;   // written only when the table has PostScript name IDs
-  std::vector<float> coordinates;  // one per axis; missing ones are written as 0
-};
-
+// Axis records of 20 zero bytes; instance records of the subfamily name ID, flags and one zero
+// coordinate per axis, then the PostScript name ID when the table has them.
 struct FvarTable {
-  std::vector<FvarAxis> axes;
-  std::vector<FvarInstance> instances;
-  // Instance records of 6 + 4 * axisCount bytes, ending with a PostScript name ID, instead of
-  // 4 + 4 * axisCount.
+  uint16_t axisCount = 1;
+  std::vector<std::pair<uint16_t, uint16_t>> instances;  // subfamily, PostScript name ID
   bool postScriptNameIDs = false;
 };
 
 class SfntFont {
  public:
-  // A name record. Unicode (0) and Windows (3) texts are written as UTF-16 big-endian with
-  // encoding 1 (3 for Unicode); other platforms get the text's UTF-8 bytes with encoding 0.
+  // A name record. Unicode (0) and Windows (3) texts are written as UTF-16 big-endian with encoding
+  // 1 (3 for Unicode); other platforms get the low byte of each unit, encoding 0.
   SfntFont& addName(uint16_t platformID, uint16_t languageID, uint16_t nameID,
                     const std::u16string& text);
   // A name record whose string is exactly these bytes.
   SfntFont& addNameBytes(uint16_t platformID, uint16_t encodingID, uint16_t languageID,
                          uint16_t nameID, const std::vector<uint8_t>& bytes);
-  // The OS/2 table in the version 5 layout, cut or zero-padded to `length` bytes.
+  // OS/2 version 4, cut or zero-padded to `length` bytes.
   SfntFont& setOs2(const Os2Fields& fields, size_t length = 100);
-  // 'head' with these values (magic number and version set, everything else zero), cut or
-  // zero-padded to `length` bytes.
+  // 'head' with these values, magic number and version (the rest zero), cut or padded.
   SfntFont& setHead(uint16_t unitsPerEm, int16_t yMax, size_t length = 54);
-  // 'post' version 3 with these values, cut or zero-padded to `length` bytes.
+  // 'post' version 3 with these values, cut or padded.
   SfntFont& setPost(int16_t underlinePosition, int16_t underlineThickness, size_t length = 32);
   SfntFont& setFvar(const FvarTable& fvar);
-  // Replaces the table with this tag (or adds it): `tag` is four characters. A raw 'name'
-  // table given here is written as it is when no names were added.
+  // Replaces the table with this four-character tag, or adds it. A 'name' table given here is
+  // written as it is when no names were added.
   SfntFont& setTable(const std::string& tag, std::vector<uint8_t> bytes);
   // Adds one more table record with this tag, even when the tag is already present.
   SfntFont& addTable(const std::string& tag, std::vector<uint8_t> bytes);
-  // Bytes written after the last table, outside every table.
+  // Bytes written after the last table.
   SfntFont& setTrailingBytes(std::vector<uint8_t> bytes);
   SfntFont& setSfntVersion(uint32_t version);
 
-  // The whole file. Tables follow the directory in the order they were set or added, each
-  // 4-byte aligned; their records are sorted by tag (stable for repeated tags) and their
-  // offsets count from the start of a file in which this font starts at `fontOffset`.
+  // The whole file: the tables follow the directory in the order they were set or added, each
+  // 4-byte aligned; their records are sorted by tag (stable for repeated tags) and their offsets
+  // count from the start of a file in which this font starts at `fontOffset`.
   std::vector<uint8_t> build(uint32_t fontOffset = 0) const;
 
  private:
-  struct NameRecord {
-    uint16_t platformID;
-    uint16_t encodingID;
-    uint16_t languageID;
-    uint16_t nameID;
-    std::vector<uint8_t> bytes;
-  };
   struct Table {
     std::string tag;
     std::vector<uint8_t> bytes;
   };
-  std::vector<uint8_t> nameTable() const;
 
   uint32_t sfntVersion_ = 0x00010000;
-  std::vector<NameRecord> names_;
-  std::vector<Table> tables_;  // every table but 'name', which is built from names_
+  std::vector<std::vector<uint8_t>> nameRecords_;  // each record's 10 bytes, then its string
+  std::vector<Table> tables_;                      // every table but 'name'
   std::vector<uint8_t> trailing_;
 };
 
 // A collection ("ttcf", version 1.0) of these fonts, each whole font after the header in turn.
 std::vector<uint8_t> buildCollection(const std::vector<SfntFont>& fonts);
 
-// A font with Windows English (1033) names 1 (family), 2 (style), 4 (full name) and
-// 6 (PostScript name), a 'head' with 1000 units per em, an OS/2 and a 'post'.
+// A font with Windows English (1033) names 1 (family), 2 (style), 4 (full name) and 6 (PostScript
+// name), a 'head' with 1000 units per em, an OS/2 and a 'post'.
 SfntFont namedFont(const std::u16string& family, const std::u16string& style,
                    const std::u16string& fullName, const std::u16string& postScriptName);
+
+// namedFont "Var" / "Regular" with 2 axes and 3 named instances, 258 "Regular" (PostScript name 300
+// "Var-Regular"), 259 "Bold", in German (1031) "Fett" (301 "Var-Bold") and 260 "Bold Condensed"
+// (none); 256 and 999 are names no instance refers to.
+SfntFont variableFont(bool postScriptNameIDs);
 
 // Big-endian stores into a built file, for damaging it on purpose.
 void putU16(std::vector<uint8_t>& bytes, size_t offset, uint16_t value);
 void putU32(std::vector<uint8_t>& bytes, size_t offset, uint32_t value);
 
-// Where a table lies in a built file: the offset of its record in the directory of the font
-// that starts at `fontOffset`, and the table's offset and length. Nothing when absent.
+// Where a table lies in a built file: the offset of its record in the directory of the font that
+// starts at `fontOffset`, and the table's offset and length. Nothing when absent.
 struct TableInFile {
   size_t recordOffset;
   uint32_t offset;
