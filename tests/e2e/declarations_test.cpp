@@ -1,7 +1,9 @@
 // The parameter panel as the host recorded the module's declarations.
 #include <gtest/gtest.h>
 
+#include <iterator>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "utf16_text.h"
@@ -10,173 +12,107 @@
 namespace waveform_test {
 namespace {
 
-using vtpl::host::ChoiceEntry;
-using vtpl::host::Parameter;
-using vtpl::host::ParameterKind;
+using vtpl::host::ParameterDeclaration;
+using Kind = vtpl::host::ParameterKind;
 using Groups = std::vector<std::u16string>;
-
-struct ExpectedParameter {
-  const char* id;
-  ParameterKind kind;
-  const char16_t* label;
-  Groups groups;
-  uint32_t flags;
-  std::array<double, 3> defaults;
-};
 
 const Groups kTop = {};
 const Groups kControls = {u"Controls"};
 const Groups kClip = {u"Controls", u"Clip"};
 const Groups kComparison = {u"Controls", u"Comparison"};
 const Groups kOptions = {u"Controls", u"Options"};
-const Groups kRenderToLayer = {u"Controls", u"Render to Layer"};
+const Groups kRender = {u"Controls", u"Render to Layer"};
 const Groups kPosition = {u"Controls", u"Render to Layer", u"Position"};
+constexpr double kGrey = 47.0f / 255.0f;  // defaults are the floats the host receives
 
-// Defaults are given as the floats the host receives.
-const std::vector<ExpectedParameter> kExpectedPanel = {
-    {"waveformControl", ParameterKind::Control, u"", kTop, 0x60, {0, 0, 0}},
-    {"waveformMode", ParameterKind::Choice, u"Mode", kControls, 0x100, {0, 0, 0}},
-    {"waveformDirection", ParameterKind::Angle, u"Direction", kControls, 0x101, {0, 0, 0}},
-    {"waveformBrightness", ParameterKind::Slider, u"Brightness", kControls, 0x101, {1, 0, 0}},
-    {"clipStartPos", ParameterKind::Point, u"Start", kClip, 1, {-640, -360, 0}},
-    {"clipEndPos", ParameterKind::Point, u"End", kClip, 1, {640, 360, 0}},
-    {"overlayLayer", ParameterKind::Layer, u"Compare To", kComparison, 0, {0, 0, 0}},
-    {"scopeComparisonType", ParameterKind::Choice, u"Render Mode", kComparison, 0, {0, 0, 0}},
-    {"showComparison", ParameterKind::Bool, u"Comparison Layer", kComparison, 2, {1, 0, 0}},
-    {"overlayChannels", ParameterKind::Choice, u"Output Channels", kComparison, 2, {0, 0, 0}},
-    {"analysisDownsample",
-     ParameterKind::Choice,
-     u"Analysis Downsample",
-     kOptions,
-     0x100,
-     {0, 0, 0}},
-    {"defaultColorSpace",
-     ParameterKind::Bool,
-     u"Use Default Color Space",
-     kOptions,
-     0x62,
-     {1, 0, 0}},
-    {"colorSpace", ParameterKind::Choice, u"Color Space", kOptions, 0x100, {2, 0, 0}},
-    {"showGuidelines", ParameterKind::Bool, u"Guidelines", kOptions, 2, {1, 0, 0}},
-    {"showsAxisLabel", ParameterKind::Bool, u"IRE Labels", kOptions, 2, {1, 0, 0}},
-    {"showStandardColorBars",
-     ParameterKind::Bool,
-     u"Standard Color Bars",
-     kOptions,
-     0x100,
-     {1, 0, 0}},
-    {"blendType", ParameterKind::Choice, u"Blend", kRenderToLayer, 0, {0, 0, 0}},
-    {"scopePositionTL", ParameterKind::Point, u"Top-Left", kPosition, 3, {-640, 360, 0}},
-    {"scopePositionBR", ParameterKind::Point, u"Bottom-Right", kPosition, 3, {640, -360, 0}},
-    {"renderToLayerShowGuidelines",
-     ParameterKind::Bool,
-     u"Guidelines",
-     kRenderToLayer,
-     3,
-     {0, 0, 0}},
-    {"renderToLayerShowStandardColorBars",
-     ParameterKind::Bool,
-     u"Standard Color Bars",
-     kRenderToLayer,
-     3,
-     {0, 0, 0}},
-    {"renderToLayerShowsAxisLabel",
-     ParameterKind::Bool,
-     u"IRE Labels",
-     kRenderToLayer,
-     3,
-     {0, 0, 0}},
-    {"renderToLayerLabelScale", ParameterKind::Float, u"Label Scale", kRenderToLayer, 2, {2, 0, 0}},
-    {"renderToLayerBackgroundColor",
-     ParameterKind::Color,
-     u"Background Color",
-     kRenderToLayer,
-     3,
-     {47.0f / 255.0f, 47.0f / 255.0f, 47.0f / 255.0f}},
-    {"renderToLayerBackgroundAlpha",
-     ParameterKind::Float,
-     u"Background Alpha",
-     kRenderToLayer,
-     3,
-     {0, 0, 0}},
+struct ExpectedParameter {
+  const char* id;
+  Kind kind;
+  const char16_t* label;
+  Groups groups;
+  uint32_t flags;
+  std::array<double, 3> defaults;
 };
 
-const Parameter& parameter(vtpl::host::EffectHost& host, const char* id) {
-  const Parameter* found = host.parameters().find(id);
+const ExpectedParameter kExpectedPanel[] = {
+    {"waveformControl", Kind::Control, u"", kTop, 0x60, {0}},
+    {"waveformMode", Kind::Choice, u"Mode", kControls, 0x100, {0}},
+    {"waveformDirection", Kind::Angle, u"Direction", kControls, 0x101, {0}},
+    {"waveformBrightness", Kind::Slider, u"Brightness", kControls, 0x101, {1}},
+    {"clipStartPos", Kind::Point, u"Start", kClip, 1, {-640, -360}},
+    {"clipEndPos", Kind::Point, u"End", kClip, 1, {640, 360}},
+    {"overlayLayer", Kind::Layer, u"Compare To", kComparison, 0, {0}},
+    {"scopeComparisonType", Kind::Choice, u"Render Mode", kComparison, 0, {0}},
+    {"showComparison", Kind::Bool, u"Comparison Layer", kComparison, 2, {1}},
+    {"overlayChannels", Kind::Choice, u"Output Channels", kComparison, 2, {0}},
+    {"analysisDownsample", Kind::Choice, u"Analysis Downsample", kOptions, 0x100, {0}},
+    {"defaultColorSpace", Kind::Bool, u"Use Default Color Space", kOptions, 0x62, {1}},
+    {"colorSpace", Kind::Choice, u"Color Space", kOptions, 0x100, {2}},
+    {"showGuidelines", Kind::Bool, u"Guidelines", kOptions, 2, {1}},
+    {"showsAxisLabel", Kind::Bool, u"IRE Labels", kOptions, 2, {1}},
+    {"showStandardColorBars", Kind::Bool, u"Standard Color Bars", kOptions, 0x100, {1}},
+    {"blendType", Kind::Choice, u"Blend", kRender, 0, {0}},
+    {"scopePositionTL", Kind::Point, u"Top-Left", kPosition, 3, {-640, 360}},
+    {"scopePositionBR", Kind::Point, u"Bottom-Right", kPosition, 3, {640, -360}},
+    {"renderToLayerShowGuidelines", Kind::Bool, u"Guidelines", kRender, 3, {0}},
+    {"renderToLayerShowStandardColorBars", Kind::Bool, u"Standard Color Bars", kRender, 3, {0}},
+    {"renderToLayerShowsAxisLabel", Kind::Bool, u"IRE Labels", kRender, 3, {0}},
+    {"renderToLayerLabelScale", Kind::Float, u"Label Scale", kRender, 2, {2}},
+    {"renderToLayerBackgroundColor",
+     Kind::Color,
+     u"Background Color",
+     kRender,
+     3,
+     {kGrey, kGrey, kGrey}},
+    {"renderToLayerBackgroundAlpha", Kind::Float, u"Background Alpha", kRender, 3, {0}},
+};
+
+const ParameterDeclaration& declaration(vtpl::host::EffectHost& host, const char* id) {
+  const vtpl::host::Parameter* found = host.parameters().find(id);
   if (found == nullptr) {
     throw std::runtime_error(std::string("not declared: ") + id);
   }
-  return *found;
-}
-
-std::vector<ChoiceEntry> choices(vtpl::host::EffectHost& host, const char* id) {
-  return parameter(host, id).declaration.choices;
-}
-
-std::string describe(const std::vector<ChoiceEntry>& entries) {
-  std::string text;
-  for (const ChoiceEntry& entry : entries) {
-    text += vtpl::host::toUtf8(entry.text) + "=" + std::to_string(entry.value) + "|";
-  }
-  return text;
+  return found->declaration;
 }
 
 TEST(Declarations, PanelMatchesTheParameterTableInOrder) {
   auto host = openHost();
-  const std::vector<Parameter>& declared = host->parameters().parameters();
-  ASSERT_EQ(declared.size(), kExpectedPanel.size());
-  for (size_t i = 0; i < kExpectedPanel.size(); ++i) {
-    const ExpectedParameter& expected = kExpectedPanel[i];
-    const vtpl::host::ParameterDeclaration& actual = declared[i].declaration;
-    SCOPED_TRACE(std::to_string(i + 1) + " " + expected.id);
-    EXPECT_EQ(actual.id, expected.id);
-    EXPECT_EQ(actual.kind, expected.kind);
-    EXPECT_EQ(actual.label, expected.label);
-    EXPECT_EQ(actual.groupPath, expected.groups);
-    EXPECT_EQ(actual.flags, expected.flags);
-    EXPECT_EQ(actual.defaults, expected.defaults);
-    EXPECT_TRUE(actual.unit.empty());
+  const std::vector<vtpl::host::Parameter>& declared = host->parameters().parameters();
+  ASSERT_EQ(declared.size(), std::size(kExpectedPanel));
+  for (size_t i = 0; i < declared.size(); ++i) {
+    const ExpectedParameter& e = kExpectedPanel[i];
+    const ParameterDeclaration& d = declared[i].declaration;
+    EXPECT_EQ(std::tie(d.id, d.kind, d.label, d.groupPath, d.flags, d.defaults),
+              std::make_tuple(e.id, e.kind, e.label, e.groups, e.flags, e.defaults))
+        << i + 1 << " " << e.id;
+    EXPECT_TRUE(d.unit.empty()) << e.id;
   }
   EXPECT_EQ(host->parameters().openGroupCount(), 0u);
   EXPECT_TRUE(host->unknownParameterIds().empty());
 }
 
-TEST(Declarations, NumericRangesAndDecimals) {
+TEST(Declarations, RangesDecimalsAndTheCustomControl) {
+  // Minimum, maximum, the slider's minimum and maximum.
+  const std::pair<const char*, std::array<double, 4>> cases[] = {
+      {"waveformBrightness", {0.1f, 10, 0.1f, 2}},
+      {"renderToLayerLabelScale", {1, 10, 0, 0}},
+      {"renderToLayerBackgroundAlpha", {0, 1, 0, 0}},
+  };
   auto host = openHost();
-  const auto& brightness = parameter(*host, "waveformBrightness").declaration;
-  EXPECT_EQ(brightness.min, 0.1f);
-  EXPECT_EQ(brightness.max, 10.0f);
-  EXPECT_EQ(brightness.sliderMin, 0.1f);
-  EXPECT_EQ(brightness.sliderMax, 2.0f);
-  EXPECT_EQ(brightness.decimals, 2);
-
-  const auto& labelScale = parameter(*host, "renderToLayerLabelScale").declaration;
-  EXPECT_EQ(labelScale.min, 1.0f);
-  EXPECT_EQ(labelScale.max, 10.0f);
-  EXPECT_EQ(labelScale.decimals, 2);
-
-  const auto& alpha = parameter(*host, "renderToLayerBackgroundAlpha").declaration;
-  EXPECT_EQ(alpha.min, 0.0f);
-  EXPECT_EQ(alpha.max, 1.0f);
-  EXPECT_EQ(alpha.decimals, 2);
-
-  EXPECT_EQ(parameter(*host, "waveformDirection").declaration.angleOption, 1);
-}
-
-TEST(Declarations, CustomControl) {
-  auto host = openHost();
-  const auto& control = parameter(*host, "waveformControl").declaration;
+  for (const auto& [id, range] : cases) {
+    const ParameterDeclaration& d = declaration(*host, id);
+    EXPECT_EQ((std::array<double, 4>{d.min, d.max, d.sliderMin, d.sliderMax}), range) << id;
+    EXPECT_EQ(d.decimals, 2) << id;
+  }
+  EXPECT_EQ(declaration(*host, "waveformDirection").angleOption, 1);
+  const ParameterDeclaration& control = declaration(*host, "waveformControl");
   EXPECT_EQ(control.aspect, 1.6666666269302368);
   EXPECT_EQ(control.controlSizes, (std::array<int32_t, 4>{250, 150, 500, 300}));
   EXPECT_TRUE(control.secondText.empty());
 }
 
 TEST(Declarations, ChoiceItemsAndValues) {
-  struct Case {
-    const char* id;
-    const char* items;
-  };
-  const Case cases[] = {
+  const std::pair<const char*, const char*> cases[] = {
       {"waveformMode", "Luminance=0|RGB=1|CbCr=4|Red=5|Green=6|Blue=7|Alpha=8|"},
       {"scopeComparisonType", "Side by Side=0|Overlay=1|Single Scope=2|"},
       {"overlayChannels", "RG=0|RB=1|GR=2|GB=3|BR=4|BG=5|"},
@@ -187,19 +123,13 @@ TEST(Declarations, ChoiceItemsAndValues) {
        "Hardlight=8|Lighten=3|Multiply=9|Overlay=6|Screen=4|Softlight=7|Subtract=12|"},
   };
   auto host = openHost();
-  for (const Case& c : cases) {
-    EXPECT_EQ(describe(choices(*host, c.id)), c.items) << c.id;
+  for (const auto& [id, items] : cases) {
+    std::string text;
+    for (const vtpl::host::ChoiceEntry& entry : declaration(*host, id).choices) {
+      text += vtpl::host::toUtf8(entry.text) + "=" + std::to_string(entry.value) + "|";
+    }
+    EXPECT_EQ(text, items) << id;
   }
-}
-
-TEST(Declarations, ChoiceReadsAnswerItemValuesNotPositions) {
-  auto host = openHost();
-  int32_t value = -1;
-  ASSERT_TRUE(host->parameters().readInt("colorSpace", value));
-  EXPECT_EQ(value, 2020);
-  host->parameters().setFromText("blendType", "Color Burn");
-  ASSERT_TRUE(host->parameters().readInt("blendType", value));
-  EXPECT_EQ(value, 11);
 }
 
 TEST(Declarations, LayerLabelDependsOnHostVersion) {
@@ -210,8 +140,7 @@ TEST(Declarations, LayerLabelDependsOnHostVersion) {
   for (const auto& [version, label] : cases) {
     vtpl::host::HostSettings settings = declaredStateSettings();
     settings.version = version;
-    auto host = openHost(settings);
-    EXPECT_EQ(parameter(*host, "overlayLayer").declaration.label, label) << version;
+    EXPECT_EQ(declaration(*openHost(settings), "overlayLayer").label, label) << version;
   }
 }
 

@@ -2,7 +2,8 @@
 #include <gtest/gtest.h>
 
 #include <climits>
-#include <cstring>
+#include <sstream>
+#include <tuple>
 #include <vector>
 
 #include "waveform_module.h"
@@ -12,66 +13,55 @@ namespace {
 
 using vtpl::HostEffectRecord;
 
-// Everything a message could change that the host can see.
-struct Observable {
-  std::vector<uint8_t> recordBytes;
-  std::vector<std::array<double, 3>> values;
-  std::vector<bool> visibility;
-  int callbacks;
-
-  explicit Observable(vtpl::host::EffectHost& host)
-      : recordBytes(sizeof(HostEffectRecord)), callbacks(host.callbackCount()) {
-    std::memcpy(recordBytes.data(), &host.record(), sizeof(HostEffectRecord));
-    for (const vtpl::host::Parameter& parameter : host.parameters().parameters()) {
-      values.push_back(parameter.value);
-      visibility.push_back(parameter.visible);
-    }
+// Everything a message could change that the host can see: the record's bytes, the panel's
+// values and visibility, and the number of callbacks made.
+auto observable(vtpl::host::EffectHost& host) {
+  const auto* record = reinterpret_cast<const uint8_t*>(&host.record());
+  std::vector<double> panel;
+  for (const vtpl::host::Parameter& p : host.parameters().parameters()) {
+    panel.insert(panel.end(), {p.value[0], p.value[1], p.value[2], p.visible ? 1.0 : 0.0});
   }
-  bool operator==(const Observable& other) const {
-    return recordBytes == other.recordBytes && values == other.values &&
-           visibility == other.visibility && callbacks == other.callbacks;
-  }
-};
-
-struct CodeCase {
-  int32_t code;
-  int32_t result;
-};
+  return std::make_tuple(std::vector<uint8_t>(record, record + sizeof(HostEffectRecord)), panel,
+                         host.callbackCount());
+}
 
 TEST(Dispatch, CodesWithoutActionAnswerAndTouchNothing) {
   // Acknowledged; gaps inside the handled range and everything outside it; reactions with no
   // parameter named.
-  const CodeCase cases[] = {
+  const std::pair<int32_t, int32_t> cases[] = {
       {11, 1},    {1004, 1},      {1007, 1}, {1011, 1}, {5, 2},    {6, 2},         {9, 2},
       {12, 2},    {15, 2},        {101, 2},  {1000, 2}, {1012, 2}, {INT32_MAX, 2}, {-1, 2},
       {-1001, 2}, {INT32_MIN, 2}, {7, 1},    {13, 1},   {14, 1},
   };
   auto host = openHost();
-  for (const CodeCase& c : cases) {
-    const Observable before(*host);
+  for (const auto& [code, result] : cases) {
+    const auto before = observable(*host);
     testing::internal::CaptureStdout();
-    EXPECT_EQ(host->send(c.code), c.result) << "code " << c.code;
-    EXPECT_EQ(testing::internal::GetCapturedStdout(), "") << "code " << c.code;
-    EXPECT_TRUE(Observable(*host) == before) << "code " << c.code << " changed the host's state";
+    EXPECT_EQ(host->send(code), result) << "code " << code;
+    EXPECT_EQ(testing::internal::GetCapturedStdout(), "") << "code " << code;
+    EXPECT_TRUE(observable(*host) == before) << "code " << code << " changed the host's state";
+  }
+  // Reactions to parameters without a reaction.
+  for (const char* id : {"waveformBrightness", "colorSpaceX", "", "showComparison"}) {
+    for (const int32_t message : {7, 13, 14}) {
+      const auto before = observable(*host);
+      EXPECT_EQ(host->editParameter(id, message), 1) << id << " " << message;
+      EXPECT_TRUE(observable(*host) == before) << id << " " << message;
+    }
   }
 }
 
-TEST(Dispatch, ReactionsToUnrelatedIdsTouchNothing) {
-  auto host = openHost();
-  for (const char* id : {"waveformBrightness", "colorSpaceX", "", "showComparison"}) {
-    for (int32_t message : {7, 13, 14}) {
-      const Observable before(*host);
-      EXPECT_EQ(host->editParameter(id, message), 1) << id << " " << message;
-      EXPECT_TRUE(Observable(*host) == before) << id << " " << message;
-    }
+TEST(Dispatch, NullRecordIsNotHandled) {
+  for (const int32_t message :
+       {0, 1, 2, 3, 4, 7, 8, 10, 11, 13, 1001, 1002, 1003, 1004, -1, INT32_MAX}) {
+    EXPECT_EQ(waveformModule().notifyEntry()(nullptr, nullptr, message), 2) << message;
   }
 }
 
 TEST(Dispatch, SetUpPrintsTheBannerOnlyWhenVerbose) {
   for (const bool verbose : {false, true}) {
-    vtpl::host::HostSettings settings = declaredStateSettings();
+    vtpl::host::HostSettings settings = glSettings();
     settings.verbose = verbose;
-    settings.gl = true;
     vtpl::host::EffectHost host(waveformModule(), settings);
     testing::internal::CaptureStdout();
     host.open();                                   // ends with message 8
@@ -82,55 +72,39 @@ TEST(Dispatch, SetUpPrintsTheBannerOnlyWhenVerbose) {
 }
 
 TEST(Dispatch, SetUpWithoutAGlContextFailsInsteadOfCrashing) {
-  auto host = openHost();  // no GL threads: nothing is current
-  EXPECT_EQ(host->send(vtpl::kMessageSetUp), 5);
+  EXPECT_EQ(openHost()->send(vtpl::kMessageSetUp), 5);  // no GL threads: nothing is current
 }
 
-TEST(Dispatch, SetUpWithoutAnInstanceIsNotHandled) {
-  vtpl::host::EffectHost host(waveformModule(), declaredStateSettings());
-  EXPECT_EQ(host.send(vtpl::kMessageSetUp), 2);
-  EXPECT_EQ(host.record().instance, nullptr);
-}
-
+// Each message acts on its own slot; empty slots are no error, but there is nothing to set up.
 TEST(Lifecycle, EachMessageActsOnItsOwnSlot) {
+  // The message, its result, and whether the shared data and the instance exist afterwards.
+  const std::tuple<int32_t, int32_t, bool, bool> steps[] = {
+      {vtpl::kMessageDestroyInstance, 1, false, false},
+      {vtpl::kMessageDestroySharedData, 1, false, false},
+      {vtpl::kMessageAttach, 1, false, false},
+      {vtpl::kMessageDetach, 1, false, false},
+      {vtpl::kMessageSetUp, 2, false, false},
+      {vtpl::kMessageCreateSharedData, 1, true, false},
+      {vtpl::kMessageCreateInstance, 1, true, true},
+      {vtpl::kMessageDestroySharedData, 1, false, true},
+      {vtpl::kMessageDestroyInstance, 1, false, false},
+  };
   vtpl::host::EffectHost host(waveformModule(), declaredStateSettings());
-  EXPECT_EQ(host.send(vtpl::kMessageCreateSharedData), 1);
-  EXPECT_NE(host.record().sharedData, nullptr);
-  EXPECT_EQ(host.record().instance, nullptr);
-
-  EXPECT_EQ(host.send(vtpl::kMessageCreateInstance), 1);
-  void* const instance = host.record().instance;
-  EXPECT_NE(instance, nullptr);
-
-  EXPECT_EQ(host.send(vtpl::kMessageDestroySharedData), 1);
-  EXPECT_EQ(host.record().sharedData, nullptr);
-  EXPECT_EQ(host.record().instance, instance);
-
-  EXPECT_EQ(host.send(vtpl::kMessageDestroyInstance), 1);
-  EXPECT_EQ(host.record().instance, nullptr);
-}
-
-TEST(Lifecycle, DestroyingEmptySlotsIsHandled) {
-  vtpl::host::EffectHost host(waveformModule(), declaredStateSettings());
-  EXPECT_EQ(host.send(vtpl::kMessageDestroyInstance), 1);
-  EXPECT_EQ(host.send(vtpl::kMessageDestroySharedData), 1);
-  EXPECT_EQ(host.record().instance, nullptr);
-  EXPECT_EQ(host.record().sharedData, nullptr);
-}
-
-TEST(Lifecycle, AttachAndDetachWithoutSharedDataAreHandled) {
-  vtpl::host::EffectHost host(waveformModule(), declaredStateSettings());
-  EXPECT_EQ(host.send(vtpl::kMessageAttach), 1);
-  EXPECT_EQ(host.send(vtpl::kMessageDetach), 1);
-  EXPECT_EQ(host.record().sharedData, nullptr);
+  void* instance = nullptr;
+  for (const auto& [message, result, sharedData, hasInstance] : steps) {
+    EXPECT_EQ(host.send(message), result) << message;
+    EXPECT_EQ(host.record().sharedData != nullptr, sharedData) << message;
+    EXPECT_EQ(host.record().instance != nullptr, hasInstance) << message;
+    if (instance != nullptr && hasInstance) {
+      EXPECT_EQ(host.record().instance, instance) << message;
+    }
+    instance = host.record().instance;
+  }
 }
 
 TEST(Lifecycle, HostSendsTheLifecycleInOrder) {
   std::ostringstream trace;
-  {
-    vtpl::host::HostSettings settings;  // with the initial announcements
-    auto host = openHost(settings, &trace);
-  }
+  openHost(vtpl::host::HostSettings(), &trace);  // with the initial announcements; then closed
   std::vector<int> messages;
   std::istringstream lines(trace.str());
   for (std::string line; std::getline(lines, line);) {
@@ -138,13 +112,10 @@ TEST(Lifecycle, HostSendsTheLifecycleInOrder) {
       messages.push_back(std::stoi(line.substr(9)));
     }
   }
-  ASSERT_GE(messages.size(), 5u);
-  EXPECT_EQ(std::vector<int>(messages.begin(), messages.begin() + 3), (std::vector<int>{3, 0, 2}));
-  EXPECT_EQ(std::vector<int>(messages.end() - 2, messages.end()), (std::vector<int>{1, 4}));
-  for (size_t i = 3; i + 2 < messages.size(); ++i) {
-    EXPECT_EQ(messages[i], 7);  // the initial announcements, one per parameter
-  }
-  EXPECT_EQ(messages.size(), 3 + 25 + 2u);
+  std::vector<int> expected = {3, 0, 2};
+  expected.insert(expected.end(), 25, 7);  // the initial announcements, one per parameter
+  expected.insert(expected.end(), {1, 4});
+  EXPECT_EQ(messages, expected);
 }
 
 }  // namespace

@@ -16,29 +16,10 @@ namespace {
 constexpr uint8_t kSentinel = 0xAB;
 constexpr char16_t kWideSentinel = 0xABAB;
 
-struct InfoBuffers {
-  std::vector<char16_t> name = std::vector<char16_t>(vtpl::kInfoNameChars, kWideSentinel);
-  std::vector<char16_t> category = std::vector<char16_t>(vtpl::kInfoCategoryChars, kWideSentinel);
-  std::vector<char16_t> maker = std::vector<char16_t>(vtpl::kInfoMakerChars, kWideSentinel);
-  std::vector<char16_t> copyright = std::vector<char16_t>(vtpl::kInfoCopyrightChars, kWideSentinel);
-  std::vector<char> bundle = std::vector<char>(vtpl::kInfoBundleIdentifierChars, char(kSentinel));
-};
-
-vtpl::PluginInfoRecord sentinelRecord(InfoBuffers& buffers, bool withBundle) {
-  vtpl::PluginInfoRecord record;
-  std::memset(&record, kSentinel, sizeof record);
-  record.name = buffers.name.data();
-  record.category = buffers.category.data();
-  record.maker = buffers.maker.data();
-  record.copyright = buffers.copyright.data();
-  record.bundleIdentifier = withBundle ? buffers.bundle.data() : nullptr;
-  return record;
-}
-
 // The string, its terminator, and the untouched buffer after it.
 template <typename Char>
-void expectTerminatedString(const std::vector<Char>& buffer, const std::basic_string<Char>& text,
-                            Char sentinel) {
+void expectTerminatedString(const std::vector<Char>& buffer, const std::basic_string<Char>& text) {
+  const Char sentinel = sizeof(Char) == 1 ? Char(kSentinel) : Char(kWideSentinel);
   ASSERT_LT(text.size(), buffer.size());
   EXPECT_EQ(std::basic_string<Char>(buffer.data(), text.size()), text);
   EXPECT_EQ(buffer[text.size()], Char{0});
@@ -47,71 +28,57 @@ void expectTerminatedString(const std::vector<Char>& buffer, const std::basic_st
   }
 }
 
-template <typename T>
-T readAt(const vtpl::PluginInfoRecord& record, size_t offset) {
-  T value;
-  std::memcpy(&value, reinterpret_cast<const uint8_t*>(&record) + offset, sizeof value);
-  return value;
-}
-
-void expectUntouched(const vtpl::PluginInfoRecord& record, size_t from, size_t to) {
-  for (size_t offset = from; offset < to; ++offset) {
-    EXPECT_EQ(readAt<uint8_t>(record, offset), kSentinel) << "byte " << offset;
-  }
-}
-
-void expectFixedFields(const vtpl::PluginInfoRecord& record) {
+// A record and buffers filled with sentinels; the module writes its fields and leaves the
+// reserved bytes and the host's pointers alone, with or without a bundle identifier buffer.
+TEST(PluginInfo, WritesEveryFieldAndNothingElse) {
   const uint8_t guid[16] = {0x0A, 0xFB, 0xE6, 0xCD, 0x41, 0xBF, 0x24, 0x45,
                             0xA6, 0xBC, 0x3B, 0xB8, 0xDA, 0xC5, 0x69, 0xD6};
-  EXPECT_EQ(readAt<uint32_t>(record, 0), 0u);
-  EXPECT_EQ(std::memcmp(reinterpret_cast<const uint8_t*>(&record) + 4, guid, 16), 0);
-  expectUntouched(record, 20, 24);
-  EXPECT_EQ(readAt<uint32_t>(record, 56), 1u);
-  EXPECT_EQ(readAt<uint32_t>(record, 60), 0u);
-  EXPECT_EQ(readAt<uint32_t>(record, 64), 0u);
-  EXPECT_EQ(readAt<uint32_t>(record, 68), 0u);
-  EXPECT_EQ(readAt<uint32_t>(record, 72), 16u);
-  expectUntouched(record, 76, 88);
-  EXPECT_EQ(readAt<uint32_t>(record, 88), 0x089E31C7u);
-  EXPECT_EQ(readAt<uint32_t>(record, 92), 5u);
-  EXPECT_EQ(readAt<uint32_t>(record, 96), 0u);
-  expectUntouched(record, 100, 104);
-}
+  // {offset, value} of the 32-bit words: header, version, descriptor size, magic, interface.
+  const std::pair<size_t, uint32_t> words[] = {
+      {0, 0}, {56, 1}, {60, 0}, {64, 0}, {68, 0}, {72, 16}, {88, 0x089E31C7}, {92, 5}, {96, 0}};
+  const std::pair<size_t, size_t> reserved[] = {{20, 24}, {76, 88}, {100, 104}};
+  for (const bool withBundle : {true, false}) {
+    SCOPED_TRACE(withBundle ? "with bundle identifier" : "without bundle identifier");
+    std::vector<char16_t> name(vtpl::kInfoNameChars, kWideSentinel);
+    std::vector<char16_t> category(vtpl::kInfoCategoryChars, kWideSentinel);
+    std::vector<char16_t> maker(vtpl::kInfoMakerChars, kWideSentinel);
+    std::vector<char16_t> copyright(vtpl::kInfoCopyrightChars, kWideSentinel);
+    std::vector<char> bundle(vtpl::kInfoBundleIdentifierChars, char(kSentinel));
+    vtpl::PluginInfoRecord record;
+    std::memset(&record, kSentinel, sizeof record);
+    record.name = name.data();
+    record.category = category.data();
+    record.maker = maker.data();
+    record.copyright = copyright.data();
+    record.bundleIdentifier = withBundle ? bundle.data() : nullptr;
+    waveformModule().pluginInfoEntry()(nullptr, nullptr, &record);
 
-TEST(PluginInfo, WritesEveryFieldWithBundleIdentifier) {
-  InfoBuffers buffers;
-  vtpl::PluginInfoRecord record = sentinelRecord(buffers, true);
-  waveformModule().pluginInfoEntry()(nullptr, nullptr, &record);
-
-  expectFixedFields(record);
-  expectTerminatedString(buffers.name, std::u16string(u"Waveform {scopes}"), kWideSentinel);
-  expectTerminatedString(buffers.category, std::u16string(u"Scopes"), kWideSentinel);
-  expectTerminatedString(buffers.maker, std::u16string(u"Quorvel"), kWideSentinel);
-  expectTerminatedString(buffers.bundle, std::string("com.QUORVEL.Vantric.Scopes.Waveform"),
-                         char(kSentinel));
-  const std::u16string copyright(buffers.copyright.data());
-  EXPECT_NE(copyright.find(u"Quorvel"), std::u16string::npos);
-  EXPECT_NE(copyright.find(u"Copyright"), std::u16string::npos);
-  expectTerminatedString(buffers.copyright, copyright, kWideSentinel);
-  // The pointers themselves are the host's and stay as they were.
-  EXPECT_EQ(record.name, buffers.name.data());
-  EXPECT_EQ(record.bundleIdentifier, buffers.bundle.data());
-}
-
-TEST(PluginInfo, NullBundleIdentifierIsSkipped) {
-  InfoBuffers buffers;
-  vtpl::PluginInfoRecord record = sentinelRecord(buffers, false);
-  waveformModule().pluginInfoEntry()(nullptr, nullptr, &record);
-
-  expectFixedFields(record);
-  EXPECT_EQ(record.bundleIdentifier, nullptr);
-  expectTerminatedString(buffers.name, std::u16string(u"Waveform {scopes}"), kWideSentinel);
-  expectTerminatedString(buffers.maker, std::u16string(u"Quorvel"), kWideSentinel);
-}
-
-TEST(PluginInfo, NullRecordIsIgnored) {
-  waveformModule().pluginInfoEntry()(nullptr, nullptr, nullptr);
-  SUCCEED();  // reaching here without a fault is the check
+    const auto* bytes = reinterpret_cast<const uint8_t*>(&record);
+    EXPECT_EQ(std::memcmp(bytes + 4, guid, 16), 0);
+    for (const auto& [offset, value] : words) {
+      uint32_t word = 0;
+      std::memcpy(&word, bytes + offset, 4);
+      EXPECT_EQ(word, value) << "word at " << offset;
+    }
+    for (const auto& [from, to] : reserved) {
+      for (size_t offset = from; offset < to; ++offset) {
+        EXPECT_EQ(bytes[offset], kSentinel) << "byte " << offset;
+      }
+    }
+    EXPECT_EQ(record.name, name.data());
+    EXPECT_EQ(record.bundleIdentifier, withBundle ? bundle.data() : nullptr);
+    expectTerminatedString(name, std::u16string(u"Waveform {scopes}"));
+    expectTerminatedString(category, std::u16string(u"Scopes"));
+    expectTerminatedString(maker, std::u16string(u"Quorvel"));
+    const std::u16string copyrightText(copyright.data());
+    EXPECT_NE(copyrightText.find(u"Copyright"), std::u16string::npos);
+    EXPECT_NE(copyrightText.find(u"Quorvel"), std::u16string::npos);
+    expectTerminatedString(copyright, copyrightText);
+    if (withBundle) {
+      expectTerminatedString(bundle, std::string("com.QUORVEL.Vantric.Scopes.Waveform"));
+    }
+  }
+  waveformModule().pluginInfoEntry()(nullptr, nullptr, nullptr);  // a null record is ignored
 }
 
 TEST(PluginInfo, HostDecodesTheInformation) {

@@ -1,23 +1,27 @@
-// Frames rendered through the module on the host's GL threads: the layer reaches the output
-// unchanged, and the layers the host serves to the effect while rendering.
+// Frames rendered and the scope control drawn through the module on the host's GL threads: the
+// layer reaches the output unchanged, the host serves the own layer to the effect, and the
+// control's picture, drawn on the interface thread, is read back at the control's size.
 #include <gtest/gtest.h>
 
 #include <cmath>
 #include <cstdio>
-#include <cstdlib>
-#include <cstring>
 #include <random>
+#include <sstream>
 #include <string>
+#include <tuple>
+#include <utility>
 #include <vector>
 
 #include "gl_thread.h"
 #include "image.h"
 #include "layer_textures.h"
+#include "test_frame.h"
 #include "waveform_module.h"
 
 namespace waveform_test {
 namespace {
 
+using vtpl::host::ControlOptions;
 using vtpl::host::Image;
 
 // An opaque picture of random 8-bit levels (or any level in 0..1 for 16-bit pictures).
@@ -35,13 +39,6 @@ Image randomPicture(int width, int height, int bitDepth, unsigned seed) {
                                               : static_cast<float>(random() % 256) / 255.0f);
   }
   return picture;
-}
-
-vtpl::host::HostSettings glSettings(bool pad) {
-  vtpl::host::HostSettings settings = declaredStateSettings();
-  settings.gl = true;
-  settings.padTextures = pad;
-  return settings;
 }
 
 // Every value within `tolerance`, and the same code at the picture's bit depth.
@@ -113,50 +110,69 @@ TEST(Render, OwnLayerIsFetchedForTheRenderedFrameOnly) {
   expectSamePicture(fetched, input, 1e-6f);
 }
 
-// The comparison layer's information record as the effect reads it: kind at byte 0, frame
-// count at byte 4, height at byte 112; tests may change the layer after choosing it.
-TEST(Render, ComparisonLayerInformationIsWhatTheHostHolds) {
-  auto host = openHost();
-  vtpl::host::HostLayer* layer = host->setComparisonLayer(randomPicture(9, 5, 8, 17));
-  ASSERT_NE(layer, nullptr);
-  const vtpl::HostEffectRecord& record = host->record();
-  char identifier[vtpl::kIdentifierChars] = {};
-  void* handle = record.getLayer(host.get(), "overlayLayer", 0, 0, identifier);
-  ASSERT_EQ(handle, layer);
-  EXPECT_EQ(std::string(identifier, sizeof identifier), layer->identifier);
-
-  const auto readInfo = [&](int32_t expectedStatus) {
-    unsigned char bytes[sizeof(vtpl::HostLayerInfo)] = {};
-    EXPECT_EQ(
-        record.getLayerInfo(host.get(), handle, 0, reinterpret_cast<vtpl::HostLayerInfo*>(bytes)),
-        expectedStatus);
-    int32_t fields[3] = {};
-    std::memcpy(&fields[0], bytes + 0, 4);
-    std::memcpy(&fields[1], bytes + 4, 4);
-    std::memcpy(&fields[2], bytes + 112, 4);
-    return std::vector<int32_t>(fields, fields + 3);
-  };
-  EXPECT_EQ(readInfo(0), (std::vector<int32_t>{0, 1, 5}));
-  layer->info.kind = 3;
-  layer->info.frameCount = 12;
-  EXPECT_EQ(readInfo(0), (std::vector<int32_t>{3, 12, 5}));
-
-  EXPECT_EQ(host->setComparisonLayer(Image{}), nullptr);
-  EXPECT_EQ(record.getLayer(host.get(), "overlayLayer", 0, 0, identifier), nullptr);
+ControlOptions sized(int32_t width, int32_t height) {
+  ControlOptions options;
+  options.width = width;
+  options.height = height;
+  return options;
 }
 
-TEST(Render, ToolRendersAPictureFile) {
-  const Image input = randomPicture(31, 17, 8, 11);
-  const std::string folder = testing::TempDir();
-  const std::string in = folder + "/render_in.png";
-  const std::string out = folder + "/render_out.png";
-  vtpl::host::writePng(in, input);
-  const std::string command =
-      std::string(VTPL_HOST_TOOL_PATH) + " render '" + in + "' -o '" + out + "' --pad";
-  ASSERT_EQ(std::system(command.c_str()), 0) << command;
-  expectSamePicture(vtpl::host::readPng(out), input, 1e-6f);
-  std::remove(in.c_str());
-  std::remove(out.c_str());
+// A drawing of no size is still sent to the effect but has no picture to read back.
+TEST(ControlPicture, HasTheControlsSize) {
+  std::ostringstream trace;
+  auto host = openHost(glSettings(), &trace);
+  EXPECT_EQ(host->controlPicture().rgba.size(), 0u);
+  host->attachControl();
+  host->renderFrame(vtpl::host::colourBarTestFrame(36, 24));
+  for (const auto& [width, height] :
+       {std::pair{40, 24}, std::pair{17, 61}, std::pair{1, 1}, std::pair{0, 10}}) {
+    trace.str("");
+    ASSERT_EQ(host->drawControl(sized(width, height)), 1);
+    EXPECT_NE(trace.str().find("< Notify 1003 -> 1"), std::string::npos) << trace.str();
+    const Image& picture = host->controlPicture();
+    const int shownHeight = width == 0 ? 0 : height;
+    EXPECT_EQ(std::tie(picture.width, picture.height, picture.bitDepth),
+              std::tuple(width, shownHeight, 8));
+    EXPECT_EQ(picture.rgba.size(), 4u * width * shownHeight);
+  }
+  host->detachControl();
+}
+
+// The rows (top first) of a picture column whose `channel` is lit.
+std::vector<int> litRows(const Image& picture, int x, int channel) {
+  std::vector<int> rows;
+  for (int y = 0; y < picture.height; ++y) {
+    if (picture.pixel(x, y)[channel] > 0.2f) {
+      rows.push_back(y);
+    }
+  }
+  return rows;
+}
+
+// The control without graticule: only the trace of a grey frame, over the black waveform panel
+// inside the host's panel colour. Attached, the render analyses the frame; otherwise the control
+// analyses it on the interface thread before drawing. At 60 x 50 the margins are 10 pixels: the
+// waveform panel is rows 10 to 39 from the top, and a level v lands v x 30 pixels above its bottom.
+TEST(ControlPicture, GreyFrameTraceSitsAtItsLevelInsideTheBlackPanel) {
+  for (const bool attached : {true, false}) {
+    auto host = openHost(glSettings());
+    host->parameters().writeBool("showGuidelines", false);
+    host->parameters().writeBool("showStandardColorBars", false);
+    if (attached) {
+      host->attachControl();
+    }
+    host->renderFrame(greyPicture(32, 18));
+    ASSERT_EQ(host->drawControl(sized(60, 50)), 1);
+    EXPECT_EQ(host->callbackCount("fetchOwnLayer"), attached ? 0 : 1);
+    const Image& picture = host->controlPicture();
+    for (const int x : {0, 30, 59}) {
+      const std::string where =
+          "attached " + std::to_string(attached) + " column " + std::to_string(x);
+      EXPECT_EQ(litRows(picture, x, 0), std::vector<int>{24}) << where;
+      EXPECT_NEAR(picture.pixel(x, 5)[0], 38.0f / 255.0f, 1e-6) << where << " panel colour 0.15";
+      EXPECT_EQ(picture.pixel(x, 12)[1], 0.0f) << where << " black waveform panel";
+    }
+  }
 }
 
 }  // namespace

@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "image.h"
+#include "test_frame.h"
 
 namespace waveform_test {
 namespace {
@@ -61,24 +62,6 @@ ToolRun runTool(const std::vector<std::string>& arguments, const std::string& fo
   return run;
 }
 
-// The panel line of a parameter id, empty if the id is not printed.
-std::string panelLine(const std::string& output, const std::string& id) {
-  std::istringstream lines(output);
-  for (std::string line; std::getline(lines, line);) {
-    std::istringstream words(line);
-    std::vector<std::string> fields;
-    for (std::string word; words >> word;) {
-      fields.push_back(word);
-    }
-    for (const std::string& field : fields) {
-      if (field == id) {
-        return line;
-      }
-    }
-  }
-  return "";
-}
-
 bool hasWord(const std::string& line, const std::string& word) {
   std::istringstream words(line);
   for (std::string w; words >> w;) {
@@ -89,10 +72,22 @@ bool hasWord(const std::string& line, const std::string& word) {
   return false;
 }
 
+// The panel line of a parameter id, empty if the id is not printed.
+std::string panelLine(const std::string& output, const std::string& id) {
+  std::istringstream lines(output);
+  for (std::string line; std::getline(lines, line);) {
+    if (hasWord(line, id)) {
+      return line;
+    }
+  }
+  return "";
+}
+
+// Info prints the information and the panel on standard output; the trace of every message and
+// callback goes to standard error.
 TEST(Tool, InfoPrintsInformationAndThePanelTree) {
-  const ToolRun run = runTool({"info"});
+  const ToolRun run = runTool({"info", "--trace"});
   ASSERT_EQ(run.exitCode, 0) << run.err;
-  EXPECT_EQ(run.err, "");
   EXPECT_NE(run.out.find("Waveform {scopes}\n"), std::string::npos);
   EXPECT_NE(run.out.find("{CDE6FB0A-BF41-4524-A6BC-3BB8DAC569D6}"), std::string::npos);
   EXPECT_NE(run.out.find("Parameters (25)"), std::string::npos);
@@ -100,7 +95,6 @@ TEST(Tool, InfoPrintsInformationAndThePanelTree) {
   EXPECT_NE(run.out.find("\n  Controls\n    Mode "), std::string::npos) << run.out;
   EXPECT_NE(run.out.find("\n    Clip\n      Start "), std::string::npos) << run.out;
   EXPECT_NE(run.out.find("\n      Position\n        Top-Left "), std::string::npos) << run.out;
-
   const std::string mode = panelLine(run.out, "waveformMode");
   EXPECT_TRUE(hasWord(mode, "choice")) << mode;
   EXPECT_TRUE(hasWord(mode, "shown")) << mode;
@@ -111,39 +105,41 @@ TEST(Tool, InfoPrintsInformationAndThePanelTree) {
   // The editor's opening announcements hide what Side by Side and blend None do not use.
   EXPECT_TRUE(hasWord(panelLine(run.out, "overlayChannels"), "hidden"));
   EXPECT_TRUE(hasWord(panelLine(run.out, "scopePositionTL"), "hidden"));
-}
 
-TEST(Tool, SetChangesValuesAndVisibility) {
-  const ToolRun run = runTool({"info", "--set", "scopeComparisonType=Overlay", "--set=blendType=9",
-                               "--set", "waveformBrightness=0.5"});
-  ASSERT_EQ(run.exitCode, 0) << run.err;
-  EXPECT_TRUE(hasWord(panelLine(run.out, "overlayChannels"), "shown"));
-  EXPECT_TRUE(hasWord(panelLine(run.out, "showComparison"), "hidden"));
-  EXPECT_NE(panelLine(run.out, "blendType").find("= Multiply (default None)"), std::string::npos);
-  EXPECT_TRUE(hasWord(panelLine(run.out, "scopePositionTL"), "shown"));
-  EXPECT_NE(panelLine(run.out, "waveformBrightness").find("= 0.50 (default 1.00)"),
-            std::string::npos);
-}
-
-TEST(Tool, HostVersionChangesTheLayerLabel) {
-  const ToolRun run = runTool({"info", "--host-version", "5300"});
-  ASSERT_EQ(run.exitCode, 0) << run.err;
-  EXPECT_TRUE(hasWord(panelLine(run.out, "overlayLayer"), "Layer"));
-  EXPECT_EQ(panelLine(run.out, "overlayLayer").find("Compare To"), std::string::npos);
-}
-
-TEST(Tool, TraceLogsMessagesAndCallbacksToStandardError) {
-  const ToolRun run = runTool({"info", "--trace"});
-  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_EQ(run.out.find("Notify"), std::string::npos);
   EXPECT_NE(run.err.find("> Notify 2 (declare parameters)\n"), std::string::npos);
   EXPECT_NE(run.err.find("    defineChoice(label=\"Mode\", id=\"waveformMode\", flags=0x100, "
                          "items=\"Luminance|RGB|CbCr|Red|Green|Blue|Alpha\", "
                          "values=[0,1,4,5,6,7,8], default=0) -> 0\n"),
             std::string::npos);
   EXPECT_NE(run.err.find("< Notify 4 -> 1\n"), std::string::npos);
-  EXPECT_EQ(run.out.find("Notify"), std::string::npos);
 }
 
+// --set changes values and visibility as a user's edits do, --host-version the layer's label;
+// without --trace nothing reaches standard error. A plug-in path without folder is the file in the
+// current folder.
+TEST(Tool, SetAndHostVersionChangeThePanel) {
+  const std::string module = WAVEFORM_MODULE_PATH;
+  const size_t slash = module.rfind('/');
+  const ToolRun run =
+      runTool({"info", "--plugin", module.substr(slash + 1), "--set", "scopeComparisonType=Overlay",
+               "--set=blendType=9", "--set", "waveformBrightness=0.5", "--host-version", "5300"},
+              module.substr(0, slash));
+  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_EQ(run.err, "");
+  EXPECT_TRUE(hasWord(panelLine(run.out, "overlayChannels"), "shown"));
+  EXPECT_TRUE(hasWord(panelLine(run.out, "showComparison"), "hidden"));
+  EXPECT_NE(panelLine(run.out, "blendType").find("= Multiply (default None)"), std::string::npos);
+  EXPECT_TRUE(hasWord(panelLine(run.out, "scopePositionTL"), "shown"));
+  EXPECT_NE(panelLine(run.out, "waveformBrightness").find("= 0.50 (default 1.00)"),
+            std::string::npos);
+  const std::string layer = panelLine(run.out, "overlayLayer");
+  EXPECT_TRUE(hasWord(layer, "Layer")) << layer;
+  EXPECT_EQ(layer.find("Compare To"), std::string::npos) << layer;
+}
+
+// Which arguments are refused is the command line's unit tests'; here how the tool reports a
+// refusal (status 2, the reason and the usage) and failures of loading and setting (status 1).
 TEST(Tool, FailuresSayWhatWentWrong) {
   struct Case {
     std::vector<std::string> arguments;
@@ -159,14 +155,8 @@ TEST(Tool, FailuresSayWhatWentWrong) {
        std::string("'") + NO_NOTIFY_MODULE_PATH +
            "' is not a plug-in module: it does not export "
            "'Notify'"},
-      {{"info", "--set", "waveformMode=Purple"},
-       1,
-       "waveformMode: 'Purple' is not one of Luminance (0), RGB (1), CbCr (4)"},
       {{"info", "--set", "noSuchParameter=1"}, 1, "no parameter has the id 'noSuchParameter'"},
-      {{"info", "--set", "renderToLayerLabelScale=20"}, 1, "is outside 1 to 10"},
-      {{"paint"}, 2, "unknown command 'paint'"},
-      {{"info", "--colour"}, 2, "unknown option '--colour'"},
-      {{}, 2, "no command given"},
+      {{"info", "--colour"}, 2, "vtpl-host: unknown option '--colour'\n\nusage: vtpl-host"},
   };
   for (const Case& c : cases) {
     const ToolRun run = runTool(c.arguments);
@@ -174,15 +164,6 @@ TEST(Tool, FailuresSayWhatWentWrong) {
     EXPECT_NE(run.err.find(c.message), std::string::npos) << run.err;
     EXPECT_EQ(run.out, "") << c.message;
   }
-}
-
-TEST(Tool, PluginPathWithoutFolderIsTheFileInTheCurrentFolder) {
-  const std::string module = WAVEFORM_MODULE_PATH;
-  const size_t slash = module.rfind('/');
-  const ToolRun run =
-      runTool({"info", "--plugin", module.substr(slash + 1)}, module.substr(0, slash));
-  EXPECT_EQ(run.exitCode, 0) << run.err;
-  EXPECT_NE(run.out.find("Parameters (25)"), std::string::npos);
 }
 
 // Mesa can be told to offer GLSL 4.00 only: the effect's "#version 410" programs then fail to
@@ -213,54 +194,36 @@ TEST(Tool, DriverWithoutGlsl410FailsSetUpWithAResult) {
   std::remove(picture.c_str());
 }
 
-// A small opaque picture written to a file of the test's temporary folder.
-std::string writeTestPicture(const std::string& name, int width, int height) {
+// The host's test frame of this size written to a file of the test's temporary folder.
+std::string writeTestFrame(const std::string& name, int width, int height) {
   const std::string path = testing::TempDir() + "/" + name;
-  vtpl::host::Image image;
-  image.width = width;
-  image.height = height;
-  image.rgba.assign(4 * static_cast<size_t>(width) * height, 0.5f);
-  for (size_t i = 3; i < image.rgba.size(); i += 4) {
-    image.rgba[i] = 1.0f;
-  }
-  vtpl::host::writePng(path, image);
+  vtpl::host::writePng(path, vtpl::host::colourBarTestFrame(width, height));
   return path;
 }
 
-TEST(Tool, RenderWritesTheControlPictureAtTheAskedSize) {
-  const std::string in = writeTestPicture("tool_control_in.png", 32, 18);
+// The picture file reaches the output file unchanged, from padded storage, and the control's
+// picture has the asked size.
+TEST(Tool, RenderWritesTheFrameAndTheControlPicture) {
+  const std::string in = writeTestFrame("tool_render_in.png", 31, 17);
   const std::string out = in + ".out.png";
   const std::string scope = in + ".scope.png";
-  for (const auto& [size, width, height] :
-       {std::tuple{std::string(), 500, 300}, std::tuple{std::string("64x40"), 64, 40}}) {
-    std::vector<std::string> arguments = {"render", in, "-o", out, "--control", scope};
-    if (!size.empty()) {
-      arguments.insert(arguments.end(), {"--control-size", size});
-    }
-    const ToolRun run = runTool(arguments);
-    ASSERT_EQ(run.exitCode, 0) << run.err;
-    EXPECT_EQ(run.out, "");
-    const vtpl::host::Image picture = vtpl::host::readPng(scope);
-    EXPECT_EQ(picture.width, width) << size;
-    EXPECT_EQ(picture.height, height) << size;
-    EXPECT_EQ(picture.bitDepth, 8);
-    EXPECT_EQ(vtpl::host::readPng(out).width, 32);
-    std::remove(scope.c_str());
+  const ToolRun run =
+      runTool({"render", in, "-o", out, "--pad", "--control", scope, "--control-size", "64x40"});
+  ASSERT_EQ(run.exitCode, 0) << run.err;
+  EXPECT_EQ(run.out, "");
+  EXPECT_EQ(vtpl::host::readPng(out).rgba, vtpl::host::colourBarTestFrame(31, 17).rgba);
+  const vtpl::host::Image picture = vtpl::host::readPng(scope);
+  EXPECT_EQ(std::tie(picture.width, picture.height, picture.bitDepth), std::tuple(64, 40, 8));
+  for (const std::string& path : {in, out, scope}) {
+    std::remove(path.c_str());
   }
-  const ToolRun bad =
-      runTool({"render", in, "-o", out, "--control", scope, "--control-size", "0x5"});
-  EXPECT_EQ(bad.exitCode, 2);
-  EXPECT_NE(bad.err.find("--control-size takes WIDTHxHEIGHT"), std::string::npos) << bad.err;
-  EXPECT_NE(bad.err.find("usage: vtpl-host"), std::string::npos);
-  std::remove(in.c_str());
-  std::remove(out.c_str());
 }
 
 // A comparison layer and the render-to-layer settings (a choice by text, points, a colour) are
 // taken; the output keeps the frame's size.
 TEST(Tool, RenderTakesAComparisonLayerAndRenderToLayerSettings) {
-  const std::string in = writeTestPicture("tool_layer_in.png", 48, 27);
-  const std::string other = writeTestPicture("tool_layer_b.png", 24, 14);
+  const std::string in = writeTestFrame("tool_layer_in.png", 48, 27);
+  const std::string other = writeTestFrame("tool_layer_b.png", 24, 14);
   const std::string out = in + ".out.png";
   const ToolRun run =
       runTool({"render", in, "-o", out, "--compare", other, "--set", "blendType=Screen", "--set",
@@ -271,8 +234,7 @@ TEST(Tool, RenderTakesAComparisonLayerAndRenderToLayerSettings) {
   EXPECT_NE(run.err.find("getPoint(\"scopePositionBR\", t=0) -> (24, -13.5)"), std::string::npos);
   EXPECT_NE(run.err.find("fetchLayer(\"c0a1b2c3-"), std::string::npos);
   const vtpl::host::Image output = vtpl::host::readPng(out);
-  EXPECT_EQ(output.width, 48);
-  EXPECT_EQ(output.height, 27);
+  EXPECT_EQ(std::tie(output.width, output.height), std::tuple(48, 27));
   const ToolRun missing = runTool({"render", in, "-o", out, "--compare", in + ".none.png"});
   EXPECT_EQ(missing.exitCode, 1);
   EXPECT_NE(missing.err.find(".none.png"), std::string::npos) << missing.err;
@@ -281,36 +243,21 @@ TEST(Tool, RenderTakesAComparisonLayerAndRenderToLayerSettings) {
   }
 }
 
+// Without -o, demo writes into out/demo of the current folder, creating it, and prints the paths.
 TEST(Tool, DemoWritesTheTestFrameTheOutputAndTheScope) {
-  const std::string folder = testing::TempDir() + "/tool_demo/nested";
-  std::filesystem::remove_all(folder);
-  const ToolRun run = runTool({"demo", "-o", folder, "--control-size", "100x60"});
-  ASSERT_EQ(run.exitCode, 0) << run.err;
-  EXPECT_EQ(run.out,
-            folder + "/test-frame.png\n" + folder + "/output.png\n" + folder + "/scope.png\n");
-  const vtpl::host::Image frame = vtpl::host::readPng(folder + "/test-frame.png");
-  // The frame the point parameters' defaults span, so that the whole frame is analysed.
-  EXPECT_EQ(frame.width, 1280);
-  EXPECT_EQ(frame.height, 720);
-  const vtpl::host::Image output = vtpl::host::readPng(folder + "/output.png");
-  EXPECT_EQ(output.width, frame.width);
-  EXPECT_EQ(output.height, frame.height);
-  // Without render to layer the frame passes through unchanged.
-  EXPECT_EQ(output.rgba, frame.rgba);
-  const vtpl::host::Image scope = vtpl::host::readPng(folder + "/scope.png");
-  EXPECT_EQ(scope.width, 100);
-  EXPECT_EQ(scope.height, 60);
-  std::filesystem::remove_all(testing::TempDir() + "/tool_demo");
-}
-
-TEST(Tool, DemoWritesIntoOutDemoOfTheCurrentFolder) {
-  const std::string folder = testing::TempDir() + "/tool_demo_default";
+  const std::string folder = testing::TempDir() + "/tool_demo";
   std::filesystem::remove_all(folder);
   std::filesystem::create_directories(folder);
-  const ToolRun run = runTool({"demo", "--control-size", "20x12"}, folder);
+  const ToolRun run = runTool({"demo", "--control-size", "100x60"}, folder);
   ASSERT_EQ(run.exitCode, 0) << run.err;
   EXPECT_EQ(run.out, "out/demo/test-frame.png\nout/demo/output.png\nout/demo/scope.png\n");
-  EXPECT_TRUE(std::filesystem::is_regular_file(folder + "/out/demo/scope.png"));
+  const vtpl::host::Image frame = vtpl::host::readPng(folder + "/out/demo/test-frame.png");
+  // The frame the point parameters' defaults span, so that the whole frame is analysed.
+  EXPECT_EQ(std::tie(frame.width, frame.height), std::tuple(1280, 720));
+  // Without render to layer the frame passes through unchanged.
+  EXPECT_EQ(vtpl::host::readPng(folder + "/out/demo/output.png").rgba, frame.rgba);
+  const vtpl::host::Image scope = vtpl::host::readPng(folder + "/out/demo/scope.png");
+  EXPECT_EQ(std::tie(scope.width, scope.height), std::tuple(100, 60));
   std::filesystem::remove_all(folder);
 }
 
@@ -326,18 +273,13 @@ TEST(Tool, FontsListsTheCatalogueAndFindsNames) {
                          "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf | 0 | 0 | "),
             std::string::npos)
       << all.out;
-
+  // One family only.
   const ToolRun family = fonts({"--family", "DejaVu Sans Mono"});
   ASSERT_EQ(family.exitCode, 0) << family.err;
-  std::istringstream lines(family.out);
-  int faces = 0;
-  for (std::string line; std::getline(lines, line);) {
-    if (line.find(".ttf | ") != std::string::npos) {
-      EXPECT_NE(line.find(" | DejaVu Sans Mono | "), std::string::npos) << line;
-      ++faces;
-    }
-  }
-  EXPECT_GE(faces, 2);
+  EXPECT_NE(family.out.find("\nDejaVuSansMono-Bold | DejaVu Sans Mono Bold | DejaVu Sans Mono | "),
+            std::string::npos)
+      << family.out;
+  EXPECT_EQ(family.out.find("\nDejaVuSans |"), std::string::npos) << family.out;
 
   const ToolRun found = fonts({"--find", "DejaVu Sans Bold"});
   EXPECT_EQ(found.exitCode, 0) << found.err;

@@ -13,12 +13,30 @@ vtpl::host::HostSettings declaredStateSettings() {
   return settings;
 }
 
+vtpl::host::HostSettings glSettings(bool padTextures) {
+  vtpl::host::HostSettings settings = declaredStateSettings();
+  settings.gl = true;
+  settings.padTextures = padTextures;
+  return settings;
+}
+
 std::unique_ptr<vtpl::host::EffectHost> openHost(vtpl::host::HostSettings settings,
                                                  std::ostream* trace) {
   auto host =
       std::make_unique<vtpl::host::EffectHost>(waveformModule(), std::move(settings), trace);
   host->open();
   return host;
+}
+
+vtpl::host::Image greyPicture(int width, int height) {
+  vtpl::host::Image picture;
+  picture.width = width;
+  picture.height = height;
+  picture.rgba.assign(4 * static_cast<size_t>(width) * height, 0.5f);
+  for (size_t i = 3; i < picture.rgba.size(); i += 4) {
+    picture.rgba[i] = 1.0f;
+  }
+  return picture;
 }
 
 }  // namespace waveform_test

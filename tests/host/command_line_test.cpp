@@ -14,36 +14,11 @@ TEST(CommandLine, ReadsEveryOptionInBothForms) {
   EXPECT_EQ(line.plugin, "/x/E.vtpl");
   EXPECT_TRUE(line.trace);
   EXPECT_TRUE(line.verbose);
-  ASSERT_EQ(line.settings.size(), 2u);
-  EXPECT_EQ(line.settings[0], (std::pair<std::string, std::string>{"a", "1"}));
-  EXPECT_EQ(line.settings[1], (std::pair<std::string, std::string>{"b", "two words"}));
+  EXPECT_EQ(line.settings,
+            (std::vector<std::pair<std::string, std::string>>{{"a", "1"}, {"b", "two words"}}));
   EXPECT_EQ(line.hostVersion, 5300);
   EXPECT_EQ(line.hostIdentifier, "org.test");
-}
-
-TEST(CommandLine, DefaultsLeaveThePluginToTheTool) {
-  const CommandLine line = parseCommandLine({"info"});
-  EXPECT_TRUE(line.plugin.empty());
-  EXPECT_FALSE(line.trace);
-  EXPECT_FALSE(line.hostVersion.has_value());
   EXPECT_EQ(parseCommandLine({"--help"}).command, "help");
-}
-
-TEST(CommandLine, RefusesWhatItCannotUnderstand) {
-  const std::vector<std::vector<std::string>> cases = {
-      {},
-      {"draw"},
-      {"info", "extra"},
-      {"info", "--plugin"},
-      {"info", "--set", "novalue"},
-      {"info", "--set", "=1"},
-      {"info", "--host-version", "56x"},
-      {"info", "--host-version", "99999999999"},
-      {"info", "--frobnicate"},
-  };
-  for (const auto& arguments : cases) {
-    EXPECT_THROW(parseCommandLine(arguments), UsageError) << testing::PrintToString(arguments);
-  }
 }
 
 TEST(CommandLine, RenderTakesAComparisonAndAControlPicture) {
@@ -54,42 +29,35 @@ TEST(CommandLine, RenderTakesAComparisonAndAControlPicture) {
   EXPECT_EQ(line.output, "out.png");
   EXPECT_EQ(line.comparison, "b.png");
   EXPECT_EQ(line.controlOutput, "scope.png");
-  EXPECT_EQ(line.controlWidth, 320);
-  EXPECT_EQ(line.controlHeight, 200);
-
-  const CommandLine plain = parseCommandLine({"render", "in.png", "-o", "out.png"});
-  EXPECT_TRUE(plain.comparison.empty());
-  EXPECT_TRUE(plain.controlOutput.empty());
-  EXPECT_EQ(plain.controlWidth, 500);
-  EXPECT_EQ(plain.controlHeight, 300);
-  EXPECT_EQ(
-      parseCommandLine({"render", "in.png", "-o", "o.png", "--control-size=1x16384"}).controlHeight,
-      16384);
+  EXPECT_EQ(std::pair(line.controlWidth, line.controlHeight), std::pair(320, 200));
+  const CommandLine largest =
+      parseCommandLine({"render", "in.png", "-o", "o.png", "--control-size=1x16384"});
+  EXPECT_EQ(std::pair(largest.controlWidth, largest.controlHeight), std::pair(1, 16384));
 }
 
 TEST(CommandLine, DemoWritesIntoOutDemoUnlessTold) {
-  const CommandLine line = parseCommandLine({"demo"});
-  EXPECT_EQ(line.command, "demo");
-  EXPECT_EQ(line.output, std::filesystem::path("out") / "demo");
+  EXPECT_EQ(parseCommandLine({"demo"}).output, std::filesystem::path("out") / "demo");
   const CommandLine told = parseCommandLine({"demo", "-o", "/tmp/d", "--set", "blendType=Screen",
                                              "--compare", "b.png", "--control-size", "50x30"});
   EXPECT_EQ(told.output, "/tmp/d");
   EXPECT_EQ(told.comparison, "b.png");
-  EXPECT_EQ(told.controlWidth, 50);
-  EXPECT_EQ(told.controlHeight, 30);
-  ASSERT_EQ(told.settings.size(), 1u);
+  EXPECT_EQ(std::pair(told.controlWidth, told.controlHeight), std::pair(50, 30));
+  EXPECT_EQ(told.settings.size(), 1u);
 }
 
-TEST(CommandLine, RefusesMalformedControlSizesAndMisplacedOptions) {
-  const std::vector<std::string> sizes = {
-      "",      "x",     "500",  "500x", "x300",     "0x300", "500x0",         "-5x300",
-      "+5x30", "5x3x2", "5 x3", "5X3",  "16385x10", "1e3x2", "99999999999x1", "5x3 "};
-  for (const std::string& size : sizes) {
-    EXPECT_THROW(parseCommandLine({"render", "i.png", "-o", "o.png", "--control-size", size}),
-                 UsageError)
-        << "'" << size << "'";
-  }
-  const std::vector<std::vector<std::string>> cases = {
+TEST(CommandLine, RefusesWhatItCannotUnderstand) {
+  std::vector<std::vector<std::string>> cases = {
+      {},
+      {"draw"},
+      {"info", "extra"},
+      {"info", "--plugin"},
+      {"info", "--set", "novalue"},
+      {"info", "--set", "=1"},
+      {"info", "--host-version", "56x"},
+      {"info", "--host-version", "99999999999"},
+      {"info", "--frobnicate"},
+      {"render", "i.png"},
+      // Options of other commands.
       {"demo", "extra.png"},
       {"demo", "--control", "scope.png"},
       {"info", "--compare", "b.png"},
@@ -98,12 +66,17 @@ TEST(CommandLine, RefusesMalformedControlSizesAndMisplacedOptions) {
       {"render", "i.png", "-o", "o.png", "--compare"},
       {"render", "i.png", "-o", "o.png", "--control"},
   };
+  for (const std::string size :
+       {"", "x", "500", "500x", "x300", "0x300", "500x0", "-5x300", "+5x30", "5x3x2", "5 x3", "5X3",
+        "16385x10", "1e3x2", "99999999999x1", "5x3 "}) {
+    cases.push_back({"render", "i.png", "-o", "o.png", "--control-size", size});
+  }
   for (const auto& arguments : cases) {
     EXPECT_THROW(parseCommandLine(arguments), UsageError) << testing::PrintToString(arguments);
   }
 }
 
-TEST(CommandLine, UsageNamesTheNewCommandAndOptions) {
+TEST(CommandLine, UsageNamesTheCommandsAndOptions) {
   const std::string usage = usageText();
   for (const char* text : {"demo [-o DIR]", "--compare B.png", "--control SCOPE.png",
                            "--control-size WxH", "scopePositionTL"}) {
