@@ -16,6 +16,7 @@ namespace plugin::Scopes {
 namespace {
 
 using Plugin::host::HostCalls;
+
 constexpr std::array<float, 4> kPanelBlack = {0, 0, 0, 1};
 
 bool isExtended(const WaveformResult& result) {
