@@ -2,6 +2,7 @@
 
 #include <string>
 
+#include "gl/pass_state_guard.h"
 #include "gl/quad_maths.h"
 #include "gl/texture_units.h"
 #include "gl/textured_quad_program.h"
@@ -53,6 +54,7 @@ void copyPass(const host::HostCalls& host, EffectData& programs, const vtpl::Hos
   if (programs.programId(kCopyProgram) < 0 || render == nullptr) {
     return;
   }
+  const PassStateGuard stateGuard;
   programs.useProgram(kCopyProgram);
   attachTexture(target, 0, GL_COLOR_ATTACHMENT0, GL_TEXTURE_2D);
   programs.setUniformMatrix(programs.uniformLocation(kProjectionUniform), 4, 1, false,

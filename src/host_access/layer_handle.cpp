@@ -25,20 +25,6 @@ LayerHandle::LayerHandle(LayerHandle&& other) noexcept
       messageRecord_(other.messageRecord_),
       texture_(std::exchange(other.texture_, vtpl::HostTexture{})) {}
 
-LayerHandle& LayerHandle::operator=(LayerHandle&& other) noexcept {
-  if (this != &other) {
-    try {
-      release();
-    } catch (...) {
-    }
-    record_ = other.record_;
-    context_ = other.context_;
-    messageRecord_ = other.messageRecord_;
-    texture_ = std::exchange(other.texture_, vtpl::HostTexture{});
-  }
-  return *this;
-}
-
 void LayerHandle::release() {
   if (texture_.name == 0 || record_ == nullptr) {
     return;

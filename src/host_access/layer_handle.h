@@ -18,7 +18,7 @@ class LayerHandle {
   // Hands the texture back; a host failure there is swallowed, as nothing can be done about it.
   ~LayerHandle();
   LayerHandle(LayerHandle&& other) noexcept;
-  LayerHandle& operator=(LayerHandle&& other) noexcept;
+  LayerHandle& operator=(LayerHandle&&) = delete;
   LayerHandle(const LayerHandle&) = delete;
   LayerHandle& operator=(const LayerHandle&) = delete;
 

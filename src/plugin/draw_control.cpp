@@ -86,9 +86,7 @@ void analyseOnInterfaceThread(const HostCalls& host, ScopesEffectData& instance,
 // The scope as the control shows it: the panel's background around a black waveform panel, the
 // display flags read at time 0, labels in the interface thread's text state.
 ScopeDrawing controlScopeDrawing(const HostCalls& host, const vtpl::HostControlRecord& control) {
-  const auto flag = [&host](const char* id) {
-    return host.call(&HostEffectRecord::getBool, id, kDisplayTime) != 0;
-  };
+  const auto flag = [&host](const char* id) { return readBool(host, id, kDisplayTime); };
   ScopeDrawing drawing;
   drawing.composition = readCompositionSettings(host);
   drawing.background = {static_cast<float>(control.backgroundRed),

@@ -4,6 +4,7 @@
 #include <string_view>
 
 #include "plugin/parameter_ids.h"
+#include "plugin/scope_settings_reader.h"
 #include "scope/parameter_choices.h"
 
 namespace plugin::Scopes {
@@ -15,28 +16,24 @@ namespace id = ParamId;
 
 constexpr int32_t kTimeZero = 0;
 
-int32_t readInt(const HostCalls& host, const char* paramId) {
-  return host.call(&HostEffectRecord::getInt, paramId, kTimeZero);
-}
-
 void setVisible(const HostCalls& host, const char* paramId, bool visible) {
   const uint8_t shown = visible ? 1 : 0;
   host.call(&HostEffectRecord::setParamVisible, paramId, &shown);
 }
 
 void showComparisonOptions(const HostCalls& host) {
-  const int32_t type = readInt(host, id::kScopeComparisonType);
+  const int32_t type = readInt(host, id::kScopeComparisonType, kTimeZero);
   setVisible(host, id::kShowComparison, type == kComparisonSingleScope);
   setVisible(host, id::kOverlayChannels, type == kComparisonOverlay);
 }
 
 void showColorSpace(const HostCalls& host) {
-  const int32_t mode = readInt(host, id::kWaveformMode);
+  const int32_t mode = readInt(host, id::kWaveformMode, kTimeZero);
   setVisible(host, id::kColorSpace, mode == kModeLuminance || mode == kModeCbCr);
 }
 
 void showRenderToLayerOptions(const HostCalls& host) {
-  const bool blending = readInt(host, id::kBlendType) != kBlendNone;
+  const bool blending = readInt(host, id::kBlendType, kTimeZero) != kBlendNone;
   for (const char* paramId :
        {id::kScopePositionTL, id::kScopePositionBR, id::kRenderToLayerShowGuidelines,
         id::kRenderToLayerShowsAxisLabel, id::kRenderToLayerShowStandardColorBars,
@@ -48,7 +45,7 @@ void showRenderToLayerOptions(const HostCalls& host) {
 
 // While the colour space follows the layer, pick it from the new layer's height.
 void followLayerColorSpace(const HostCalls& host) {
-  if (host.call(&HostEffectRecord::getBool, id::kDefaultColorSpace, kTimeZero) == 0) {
+  if (!readBool(host, id::kDefaultColorSpace, kTimeZero)) {
     return;
   }
   const auto* reference = static_cast<const vtpl::HostLayerReference*>(host.record().messageRecord);

@@ -10,14 +10,6 @@ using vtpl::HostEffectRecord;
 
 constexpr int32_t kLayoutTime = 0;
 
-bool readBool(const HostCalls& host, const char* id, int32_t time) {
-  return host.call(&HostEffectRecord::getBool, id, time) != 0;
-}
-
-int32_t readInt(const HostCalls& host, const char* id, int32_t time) {
-  return host.call(&HostEffectRecord::getInt, id, time);
-}
-
 float readFloat(const HostCalls& host, const char* id, int32_t time) {
   return host.call(&HostEffectRecord::getFloat, id, time);
 }
@@ -29,6 +21,14 @@ FramePoint readPoint(const HostCalls& host, const char* id, int32_t time) {
 }
 
 }  // namespace
+
+bool readBool(const HostCalls& host, const char* id, int32_t time) {
+  return host.call(&HostEffectRecord::getBool, id, time) != 0;
+}
+
+int32_t readInt(const HostCalls& host, const char* id, int32_t time) {
+  return host.call(&HostEffectRecord::getInt, id, time);
+}
 
 ComparisonSettings readComparisonSettings(const HostCalls& host, int32_t time) {
   ComparisonSettings settings;

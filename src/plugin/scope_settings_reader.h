@@ -1,5 +1,5 @@
-// Reading the effect's parameters from the host into the plain settings the scope passes take,
-// once per message.
+// Reading the effect's parameters from the host: single values, and the plain settings the
+// scope passes take, read once per message.
 #ifndef WAVEFORM_PLUGIN_SCOPE_SETTINGS_READER_H
 #define WAVEFORM_PLUGIN_SCOPE_SETTINGS_READER_H
 
@@ -9,6 +9,10 @@
 #include "scope/scope_settings.h"
 
 namespace plugin::Scopes {
+
+// One parameter's value at `time`.
+bool readBool(const Plugin::host::HostCalls& host, const char* id, int32_t time);
+int32_t readInt(const Plugin::host::HostCalls& host, const char* id, int32_t time);
 
 // "showComparison" at `time`, and the comparison type, which the scope reads at time 0.
 ComparisonSettings readComparisonSettings(const Plugin::host::HostCalls& host, int32_t time);
