@@ -3,6 +3,8 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <tuple>
+#include <utility>
 
 #include "scope/render_to_layer.h"
 #include "scope/scope_layout.h"
@@ -69,25 +71,17 @@ TEST(ScopeLayout, OverlayRoutesEachScopeToItsChannel) {
   EXPECT_TRUE(same(overlayRouting(-1).comparison, g));
 }
 
-TEST(ScopePlacement, DefaultCornersCoverAWholeHdFrame) {
+TEST(ScopePlacement, DefaultCornersCoverAWholeHdFrameAndSwappedOnesMirror) {
+  const auto area = [](const ScopePlacement& p) {
+    return std::tuple(p.left, p.bottom, p.right, p.top, p.textureWidth, p.textureHeight);
+  };
   const auto placement = placeScope({-640, 360}, {640, -360}, 1280, 720);
-  ASSERT_TRUE(placement);
-  EXPECT_EQ(placement->left, 0);
-  EXPECT_EQ(placement->bottom, 0);
-  EXPECT_EQ(placement->right, 1280);
-  EXPECT_EQ(placement->top, 720);
-  EXPECT_EQ(placement->textureWidth, 1280u);
-  EXPECT_EQ(placement->textureHeight, 720u);
-  EXPECT_FALSE(placement->mirrorX);
-  EXPECT_FALSE(placement->mirrorY);
-
-  // Swapped corners cover the same area, mirrored both ways.
   const auto swapped = placeScope({640, -360}, {-640, 360}, 1280, 720);
-  ASSERT_TRUE(swapped);
-  EXPECT_EQ(swapped->left, 0);
-  EXPECT_EQ(swapped->top, 720);
-  EXPECT_TRUE(swapped->mirrorX);
-  EXPECT_TRUE(swapped->mirrorY);
+  ASSERT_TRUE(placement && swapped);
+  EXPECT_EQ(area(*placement), std::tuple(0.0f, 0.0f, 1280.0f, 720.0f, 1280u, 720u));
+  EXPECT_EQ(area(*swapped), area(*placement));
+  EXPECT_EQ(std::pair(placement->mirrorX, placement->mirrorY), std::pair(false, false));
+  EXPECT_EQ(std::pair(swapped->mirrorX, swapped->mirrorY), std::pair(true, true));
 }
 
 TEST(ScopePlacement, AreasUnderSixteenPixelsAreNotDrawn) {
