@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <tuple>
 
 #include "host_error.h"
 #include "waveform_module.h"
@@ -33,26 +34,21 @@ TEST(Failures, RefusedDeclarationEndsTheDeclarationsThere) {
 }
 
 TEST(Failures, ExceptionsThrownByHostCallbacksBecomeResultFive) {
-  struct Case {
-    const char* callback;
-    bool nonStandard;
-    int32_t message;
-    const char* changedId;
-  };
-  const Case cases[] = {
+  // The failing callback, whether it throws a non-standard exception, the message, the parameter.
+  const std::tuple<const char*, bool, int32_t, const char*> cases[] = {
       {"getInt", false, 7, "waveformMode"},
       {"getInt", true, 7, "blendType"},
       {"setParamVisible", false, 7, "scopeComparisonType"},
       {"setBool", true, 13, "colorSpace"},
       {"setBool", false, 14, "colorSpace"},
   };
-  for (const Case& c : cases) {
+  for (const auto& [callback, nonStandard, message, id] : cases) {
     auto host = openHost();
-    host->faults().throwInCallback = c.callback;
-    host->faults().throwNonStandard = c.nonStandard;
-    EXPECT_EQ(host->editParameter(c.changedId, c.message), 5) << c.callback;
+    host->faults().throwInCallback = callback;
+    host->faults().throwNonStandard = nonStandard;
+    EXPECT_EQ(host->editParameter(id, message), 5) << callback;
     host->faults().throwInCallback.clear();
-    EXPECT_EQ(host->changeParameter(c.changedId), 1) << "module unusable after " << c.callback;
+    EXPECT_EQ(host->changeParameter(id), 1) << "module unusable after " << callback;
   }
   for (const bool nonStandard : {false, true}) {  // during the declarations
     EffectHost host(waveformModule(), declaredStateSettings());

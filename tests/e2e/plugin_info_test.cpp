@@ -81,13 +81,6 @@ TEST(PluginInfo, WritesEveryFieldAndNothingElse) {
   waveformModule().pluginInfoEntry()(nullptr, nullptr, nullptr);  // a null record is ignored
 }
 
-TEST(PluginInfo, HostDecodesTheInformation) {
-  const vtpl::host::PluginInformation info = waveformModule().information();
-  EXPECT_EQ(vtpl::host::guidText(info.guid), "{CDE6FB0A-BF41-4524-A6BC-3BB8DAC569D6}");
-  EXPECT_EQ(info.interfaceVersion, 5u);
-  EXPECT_EQ(info.version, (std::array<uint32_t, 4>{1, 0, 0, 0}));
-}
-
 TEST(ModuleExports, OnlyPluginInfoAndNotifyAreExported) {
   const std::string command = std::string("nm -D --defined-only ") + WAVEFORM_MODULE_PATH;
   FILE* pipe = popen(command.c_str(), "r");

@@ -38,10 +38,6 @@ class TracedHost : private TraceHolder, public EffectHost {
   static constexpr char kAnalysisBuffer[] = "bytes, 0x88E4)";  // GL_STATIC_DRAW
 };
 
-int ownLayerFetches(const EffectHost& host) {
-  return host.callbackCount("fetchOwnLayer");
-}
-
 // Whether a render analyses, asks for a redraw or marks the results stale, by whether the frame is
 // watched, the controls attached, the identifier, the blend and whether the host stops the render
 // at once; stale results make the next control drawing of the frame analyse it itself.
@@ -75,7 +71,7 @@ TEST(RenderFlow, DecisionTable) {
     EXPECT_EQ(host->analyses() > 0, c.analysed);
     EXPECT_EQ(host->redrawRequests() > 0, c.redrawAsked);
     ASSERT_EQ(host->drawControl({}), 1);
-    EXPECT_EQ(ownLayerFetches(*host) > 0, c.markedStale);
+    EXPECT_EQ(host->callbackCount("fetchOwnLayer") > 0, c.markedStale);
   }
 }
 
@@ -88,7 +84,7 @@ TEST(RenderFlow, StopAtTenLeavesTheAnalysedFrameUnchanged) {
     EXPECT_EQ(host->redrawRequests(), stop ? 0 : 1);
     // A forced drawing of frame 3 analyses only if the render did not record frame 3.
     host->drawControl(ControlOptions{3, 5, true});
-    EXPECT_EQ(ownLayerFetches(*host), stop ? 1 : 0) << "stop " << stop;
+    EXPECT_EQ(host->callbackCount("fetchOwnLayer"), stop ? 1 : 0) << "stop " << stop;
   }
 }
 
@@ -171,7 +167,7 @@ TEST(RenderFlow, ControlAnalysesAStaleFrameOnlyOnce) {
   const ControlOptions drawings[] = {{}, {}, {0, 1, true}, {4, 4, true}, {2, 4, true, true}};
   for (const ControlOptions& drawing : drawings) {
     host->drawControl(drawing);
-    EXPECT_EQ(ownLayerFetches(*host), 1) << "frame " << drawing.frameIndex;
+    EXPECT_EQ(host->callbackCount("fetchOwnLayer"), 1) << "frame " << drawing.frameIndex;
     EXPECT_EQ(host->analyses(), 1) << "frame " << drawing.frameIndex;
   }
   EXPECT_EQ(host->callbackCount("releaseLayer"), 1);

@@ -4,7 +4,6 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
-#include <cstdio>
 #include <random>
 #include <sstream>
 #include <string>
@@ -32,11 +31,9 @@ Image randomPicture(int width, int height, int bitDepth, unsigned seed) {
   picture.height = height;
   picture.bitDepth = bitDepth;
   picture.rgba.resize(4 * static_cast<size_t>(width) * height);
+  const unsigned levels = bitDepth == 16 ? 65535 : 255;
   for (size_t i = 0; i < picture.rgba.size(); ++i) {
-    const bool alpha = i % 4 == 3;
-    picture.rgba[i] = alpha ? 1.0f
-                            : (bitDepth == 16 ? static_cast<float>(random() % 65536) / 65535.0f
-                                              : static_cast<float>(random() % 256) / 255.0f);
+    picture.rgba[i] = i % 4 == 3 ? 1.0f : static_cast<float>(random() % (levels + 1)) / levels;
   }
   return picture;
 }
@@ -46,18 +43,13 @@ void expectSamePicture(const Image& output, const Image& input, float tolerance)
   ASSERT_EQ(output.width, input.width);
   ASSERT_EQ(output.height, input.height);
   const float levels = input.bitDepth == 16 ? 65535.0f : 255.0f;
-  float largest = 0.0f;
   for (size_t i = 0; i < input.rgba.size(); ++i) {
     const std::string where = "pixel " + std::to_string((i / 4) % input.width) + "," +
                               std::to_string((i / 4) / input.width) + " channel " +
                               std::to_string(i % 4);
     ASSERT_EQ(std::lround(output.rgba[i] * levels), std::lround(input.rgba[i] * levels)) << where;
     ASSERT_NEAR(output.rgba[i], input.rgba[i], tolerance) << where;
-    largest = std::fmax(largest, std::fabs(output.rgba[i] - input.rgba[i]));
   }
-  char text[32];
-  std::snprintf(text, sizeof text, "%.3g", largest);
-  testing::Test::RecordProperty("largestDifference", text);
 }
 
 // The layer reaches the output from exact and padded storage, 8-bit, 16-bit and 8-bit uploaded as
@@ -103,10 +95,9 @@ TEST(Render, OwnLayerIsFetchedForTheRenderedFrameOnly) {
     fetched = vtpl::host::readLayer(own, 8);
     record.releaseLayer(host.get(), nullptr, own.name);
   });
-  EXPECT_NE(own.name, 0u);
-  EXPECT_EQ(own.allocatedWidth, 16u);  // padded storage
-  EXPECT_EQ(own.uMax, 10.0f / 16.0f);
-  EXPECT_EQ(missing.name, 0u);
+  // A texture in padded storage for frame 0, none for frame 1.
+  EXPECT_EQ(std::tuple(own.name != 0, own.allocatedWidth, own.uMax, missing.name),
+            std::tuple(true, 16u, 10.0f / 16.0f, 0u));
   expectSamePicture(fetched, input, 1e-6f);
 }
 

@@ -21,7 +21,7 @@ TEST(CommandLine, ReadsEveryOptionInBothForms) {
   EXPECT_EQ(parseCommandLine({"--help"}).command, "help");
 }
 
-TEST(CommandLine, RenderTakesAComparisonAndAControlPicture) {
+TEST(CommandLine, RenderAndDemoTakeAComparisonAndAControlPicture) {
   const CommandLine line =
       parseCommandLine({"render", "in.png", "-o", "out.png", "--compare", "b.png",
                         "--control=scope.png", "--control-size", "320x200"});
@@ -33,9 +33,7 @@ TEST(CommandLine, RenderTakesAComparisonAndAControlPicture) {
   const CommandLine largest =
       parseCommandLine({"render", "in.png", "-o", "o.png", "--control-size=1x16384"});
   EXPECT_EQ(std::pair(largest.controlWidth, largest.controlHeight), std::pair(1, 16384));
-}
-
-TEST(CommandLine, DemoWritesIntoOutDemoUnlessTold) {
+  // Demo writes into out/demo unless told.
   EXPECT_EQ(parseCommandLine({"demo"}).output, std::filesystem::path("out") / "demo");
   const CommandLine told = parseCommandLine({"demo", "-o", "/tmp/d", "--set", "blendType=Screen",
                                              "--compare", "b.png", "--control-size", "50x30"});
