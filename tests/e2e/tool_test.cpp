@@ -35,7 +35,10 @@ std::string shellQuoted(const std::string& text) {
 // `environment` ("NAME=value ...") added.
 ToolRun runTool(const std::vector<std::string>& arguments, const std::string& folder = "",
                 const std::string& environment = "", const char* tool = VTPL_HOST_TOOL_PATH) {
-  const std::string errPath = testing::TempDir() + "/tool_stderr.txt";
+  // A file of its own: tests of the tool run at the same time under ctest -j.
+  char errPath[] = "/tmp/vtpl-host-test-XXXXXX";
+  const int errFile = mkstemp(errPath);
+  EXPECT_GE(errFile, 0);
   std::string command = folder.empty() ? "" : "cd " + shellQuoted(folder) + " && ";
   command += environment.empty() ? "" : "env " + environment + " ";
   command += shellQuoted(tool);
@@ -55,7 +58,8 @@ ToolRun runTool(const std::vector<std::string>& arguments, const std::string& fo
   run.exitCode = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
   std::ifstream errStream(errPath);
   run.err.assign(std::istreambuf_iterator<char>(errStream), {});
-  std::remove(errPath.c_str());
+  close(errFile);
+  std::remove(errPath);
   return run;
 }
 
