@@ -8,6 +8,7 @@
 #include <map>
 #include <set>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "ci_or_skip.h"
@@ -146,13 +147,10 @@ TEST_F(FontCacheOnFakeSystem, FileThatCannotBeReadIsKnownByItsDisplayName) {
   install(FontHive::kMachine, u"Foo Bold (TrueType)", u"foo.ttf");
   enumerate(u"Foo", u"Bold", u"foo bold");
   FontCache cache(system_);
-  const FontRecord record = cache.findFont(u"foo bold", u"", u"");
-  EXPECT_EQ(record.filePath, fontsFolder() + u"foo.ttf");
+  const FontRecord r = cache.findFont(u"foo bold", u"", u"");
   // Nothing could be read from the file: the enumeration's names stay.
-  EXPECT_EQ(record.familyName, u"Foo");
-  EXPECT_EQ(record.styleName, u"Bold");
-  EXPECT_EQ(record.postScriptName, u"foo bold");
-  EXPECT_EQ(record.gdiFullName, u"foo bold");
+  EXPECT_EQ(std::tie(r.filePath, r.familyName, r.styleName, r.postScriptName, r.gdiFullName),
+            std::make_tuple(fontsFolder() + u"foo.ttf", u"Foo", u"Bold", u"foo bold", u"foo bold"));
 }
 
 TEST_F(FontCacheOnFakeSystem, NamesComeFromTheFileAndPathsResolve) {
@@ -168,16 +166,13 @@ TEST_F(FontCacheOnFakeSystem, NamesComeFromTheFileAndPathsResolve) {
   FontCache cache(system_);
 
   const FontRecord rel = cache.findFont(u"RelSans-Bold", u"", u"");
-  EXPECT_EQ(rel.filePath, fontsFolder() + u"rel.ttf");
-  EXPECT_EQ(rel.familyName, u"Rel Sans");
-  EXPECT_EQ(rel.gdiFamilyName, u"RelSans");
-  EXPECT_EQ(rel.styleName, u"Bold");
-  EXPECT_EQ(rel.fullName, u"Rel Sans Bold");
+  EXPECT_EQ(std::tie(rel.filePath, rel.familyName, rel.gdiFamilyName, rel.styleName, rel.fullName),
+            std::make_tuple(fontsFolder() + u"rel.ttf", u"Rel Sans", u"RelSans", u"Bold",
+                            u"Rel Sans Bold"));
   EXPECT_GT(rel.strikeoutSize, 0.0f);
   const FontRecord abs = cache.findFont(u"", u"", u"Abs Serif");
-  EXPECT_EQ(abs.filePath, outside);
-  EXPECT_EQ(abs.postScriptName, u"AbsSerif");
-  EXPECT_EQ(abs.styleName, u"Regular");
+  EXPECT_EQ(std::tie(abs.filePath, abs.postScriptName, abs.styleName),
+            std::make_tuple(outside, u"AbsSerif", u"Regular"));
   // A face no list names keeps the enumeration's names, no file and no metrics.
   const FontRecord unfiled = cache.findFont(u"Unfiled Regular", u"", u"");
   EXPECT_EQ(unfiled.postScriptName, u"Unfiled Regular");
@@ -201,19 +196,14 @@ TEST_F(FontCacheOnFakeSystem, NamedInstancesOfAVariableFontAreFacesOfTheirOwn) {
   FontCache cache(system_);
 
   const FontRecord plain = cache.findFont(u"VarSans-Regular", u"", u"");
-  EXPECT_EQ(plain.instanceId, 0);
-  EXPECT_EQ(plain.styleName, u"Regular");
+  EXPECT_EQ(std::tie(plain.instanceId, plain.styleName), std::make_tuple(0, u"Regular"));
   // An instance without a PostScript name of its own is known by its full name.
   const FontRecord light = cache.findFont(u"Var Sans Regular Light", u"", u"");
-  EXPECT_EQ(light.instanceId, 257);
-  EXPECT_EQ(light.styleName, u"Light");
-  EXPECT_EQ(light.fullName, u"Var Sans Regular Light");
-  EXPECT_EQ(light.postScriptName, u"Var Sans Regular Light");
+  EXPECT_EQ(std::tie(light.instanceId, light.styleName, light.fullName, light.postScriptName),
+            std::make_tuple(257, u"Light", u"Var Sans Regular Light", u"Var Sans Regular Light"));
   const FontRecord bold = cache.findFont(u"VarSans-BoldInstance", u"", u"");
-  EXPECT_EQ(bold.instanceId, 258);
-  EXPECT_EQ(bold.styleName, u"Bold");
-  EXPECT_EQ(bold.fullName, u"Var Sans Regular Bold");
-  EXPECT_EQ(bold.filePath, fontsFolder() + u"var.ttf");
+  EXPECT_EQ(std::tie(bold.instanceId, bold.styleName, bold.fullName, bold.filePath),
+            std::make_tuple(258, u"Bold", u"Var Sans Regular Bold", fontsFolder() + u"var.ttf"));
   EXPECT_EQ(cache.records().size(), 3u);
   // The family names its plain regular face.
   EXPECT_EQ(cache.findFont(u"x", u"Var Sans", u"y").postScriptName, u"VarSans-Regular");
@@ -230,19 +220,12 @@ TEST_F(FontCacheOnFakeSystem, UserFontReplacesAMachineFontOfTheSameName) {
   EXPECT_EQ(cache.findFont(u"Shared-Regular", u"", u"").filePath, mine);
 }
 
-TEST_F(FontCacheOnFakeSystem, FamiliesNameTheirRegularFaceElseTheirFirst) {
+TEST_F(FontCacheOnFakeSystem, LookupsTryPostScriptThenFullNamesThenFamily) {
   addFamily(u"Fam", {u"Bold", u"Regular", u"Italic"});
-  addFamily(u"Other", {u"Bold", u"Black"});
+  addFamily(u"Other", {u"Bold", u"Black"});  // no regular face: the family names its first
   FontCache cache(system_);
-  EXPECT_EQ(cache.findFont(u"", u"Fam", u"nothing").postScriptName, u"Fam-Regular");
-  EXPECT_EQ(cache.findFont(u"", u"Other", u"nothing else").postScriptName, u"Other-Black");
   EXPECT_TRUE(cache.hasFont(u"", u"Other", u"nothing"));
   EXPECT_FALSE(cache.hasFont(u"nothing", u"No Such Family", u"nothing"));
-}
-
-TEST_F(FontCacheOnFakeSystem, LookupsTryPostScriptThenFullNamesThenFamily) {
-  addFamily(u"Fam", {u"Bold", u"Regular"});
-  FontCache cache(system_);
   struct Case {
     std::u16string postScript, family, full, expected;
   };
@@ -252,6 +235,7 @@ TEST_F(FontCacheOnFakeSystem, LookupsTryPostScriptThenFullNamesThenFamily) {
       {u"", u"", u"Fam Bold", u"Fam-Bold"},                // the full name alone
       {u"x", u"", u"Fam Bold", u"Fam-Bold"},
       {u"x", u"Fam", u"y", u"Fam-Regular"},  // only the family matches
+      {u"", u"Other", u"nothing else", u"Other-Black"},
   };
   for (const Case& c : cases) {
     EXPECT_EQ(cache.findFont(c.postScript, c.family, c.full).postScriptName, c.expected)
@@ -274,21 +258,15 @@ TEST_F(FontCacheOnFakeSystem, TheMemoLooksAtTheNamesNotTheFamily) {
 TEST_F(FontCacheOnFakeSystem, DefaultIsRegularArialThenCourierNewThenTheFirst) {
   addFamily(u"Aardvark", {u"Regular"});
   addFamily(u"Courier New", {u"Regular"});
-  {
-    addFamily(u"Arial", {u"Bold", u"Regular", u"Black"});
+  addFamily(u"Arial", {u"Bold", u"Regular", u"Black"});
+  // Each round drops the family the round before chose.
+  for (const std::u16string family : {u"Arial", u"Courier New", u"Aardvark"}) {
     FontCache cache(system_);
-    EXPECT_EQ(cache.findFont(u"zzz", u"zzz", u"zzz").postScriptName, u"Arial-Regular");
+    EXPECT_EQ(cache.findFont(u"zzz", u"zzz", u"zzz").postScriptName, family + u"-Regular");
     EXPECT_FALSE(cache.hasFont(u"zzz", u"zzz", u"zzz"));
-  }
-  system_->faces.erase(system_->faces.end() - 3, system_->faces.end());
-  {
-    FontCache cache(system_);
-    EXPECT_EQ(cache.findFont(u"zzz", u"zzz", u"zzz").postScriptName, u"Courier New-Regular");
-  }
-  system_->faces.erase(system_->faces.end() - 1, system_->faces.end());
-  {
-    FontCache cache(system_);
-    EXPECT_EQ(cache.findFont(u"zzz", u"zzz", u"zzz").postScriptName, u"Aardvark-Regular");
+    while (!system_->faces.empty() && system_->faces.back().faceName == family) {
+      system_->faces.pop_back();
+    }
   }
 }
 

@@ -8,6 +8,7 @@
 #include <set>
 #include <stdexcept>
 #include <string>
+#include <tuple>
 #include <utility>
 
 #include "ci_or_skip.h"
@@ -53,9 +54,8 @@ TEST_P(InstalledFont, GlyphWithoutOutlineHasNoContoursAndTheFaceMetrics) {
        {FT_Get_Char_Index(face(), ' '), static_cast<uint32_t>(face()->num_glyphs) + 5}) {
     const GlyphDescriptor glyph = convert(index);
     EXPECT_TRUE(glyph.contours.empty()) << index;
-    EXPECT_EQ(glyph.ascender, face()->ascender / em);
-    EXPECT_EQ(glyph.descender, face()->descender / em);
-    EXPECT_EQ(glyph.lineHeight, face()->height / em);
+    EXPECT_EQ(std::make_tuple(glyph.ascender, glyph.descender, glyph.lineHeight),
+              std::make_tuple(face()->ascender / em, face()->descender / em, face()->height / em));
   }
 }
 

@@ -19,16 +19,10 @@ namespace waveform_test {
 // The OS/2 fields the font reader uses, in font units; the rest of the table is written as zero.
 struct Os2Fields {
   uint16_t fsType = 0;
-  int16_t subscriptXSize = 650;
-  int16_t subscriptYSize = 600;
-  int16_t subscriptXOffset = 0;
-  int16_t subscriptYOffset = 75;
-  int16_t superscriptXSize = 650;
-  int16_t superscriptYSize = 600;
-  int16_t superscriptXOffset = 0;
-  int16_t superscriptYOffset = 350;
-  int16_t strikeoutSize = 50;
-  int16_t strikeoutPosition = 300;
+  int16_t subscriptXSize = 650, subscriptYSize = 600, subscriptXOffset = 0, subscriptYOffset = 75;
+  int16_t superscriptXSize = 650, superscriptYSize = 600;
+  int16_t superscriptXOffset = 0, superscriptYOffset = 350;
+  int16_t strikeoutSize = 50, strikeoutPosition = 300;
 };
 
 // Axis records of 20 zero bytes; instance records of the subfamily name ID, flags and one zero
