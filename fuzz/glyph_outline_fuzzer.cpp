@@ -28,16 +28,12 @@ using vesk::plugin::lib::LinearCurve;
 using vesk::plugin::lib::QuadraticCurve;
 using waveform_test::signedArea;
 
-class Bytes {
- public:
-  Bytes(const uint8_t* data, size_t size) : data_(data), size_(size) {}
-  bool empty() const { return at_ >= size_; }
-  uint8_t next() { return at_ < size_ ? data_[at_++] : 0; }
-
- private:
-  const uint8_t* data_;
-  size_t size_;
-  size_t at_ = 0;
+struct Bytes {
+  const uint8_t* data;
+  size_t size;
+  size_t at = 0;
+  bool empty() const { return at >= size; }
+  uint8_t next() { return at < size ? data[at++] : 0; }
 };
 
 CurveContour readContour(Bytes& bytes) {
@@ -69,7 +65,7 @@ CurveContour readContour(Bytes& bytes) {
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  Bytes bytes(data, size);
+  Bytes bytes{data, size};
   vesk::plugin::lib::GlyphDescriptor descriptor;
   const int contours = 1 + bytes.next() % 4;
   for (int i = 0; i < contours && !bytes.empty(); ++i) {

@@ -21,7 +21,7 @@ namespace {
 
 using qvtl::geometry::Point2f;
 using qvtl::geometry::PointList;
-using waveform_test::signedArea;
+using waveform_test::isSimple, waveform_test::ringsApart, waveform_test::signedArea;
 
 bool inside(const PointList& ring, const Point2f& p) {
   return waveform_test::insideRing(ring, p.x, p.y);
@@ -33,16 +33,6 @@ struct Reader {
   size_t at = 0;
   uint8_t next() { return at < size ? data[at++] : 0; }
 };
-
-// Simple, with room to spare, and of some area. (On this integer grid, segments that do not
-// touch are more than the room apart.)
-bool simple(const PointList& ring) {
-  return waveform_test::isSimple(ring) && signedArea(ring) != 0;
-}
-
-bool ringsTouch(const PointList& r, const PointList& s) {
-  return !waveform_test::ringsApart(r, s);
-}
 
 PointList readRing(Reader& reader, bool byAngle, int range, float x0, float y0) {
   // Short inputs give short rings rather than rings padded with repeated points.
@@ -63,24 +53,20 @@ PointList readRing(Reader& reader, bool byAngle, int range, float x0, float y0) 
   return ring;
 }
 
-// The rings are valid when each is simple, no two touch, every hole lies inside the outer ring
-// and no hole lies inside another.
+// The rings are valid when each is simple (with room to spare: on this integer grid, segments
+// that do not touch are more than the room apart) and of some area, no two touch, every hole
+// lies inside the outer ring and no hole lies inside another.
 bool valid(const PointList& outer, const std::vector<PointList>& holes) {
-  if (!simple(outer)) {
-    return false;
-  }
-  for (size_t h = 0; h < holes.size(); ++h) {
-    if (!simple(holes[h]) || ringsTouch(outer, holes[h]) || !inside(outer, holes[h][0])) {
-      return false;
-    }
-    for (size_t k = 0; k < h; ++k) {
-      if (ringsTouch(holes[h], holes[k]) || inside(holes[h], holes[k][0]) ||
-          inside(holes[k], holes[h][0])) {
-        return false;
-      }
+  bool ok = isSimple(outer) && signedArea(outer) != 0;
+  for (size_t h = 0; h < holes.size() && ok; ++h) {
+    ok = isSimple(holes[h]) && signedArea(holes[h]) != 0 && ringsApart(outer, holes[h]) &&
+         inside(outer, holes[h][0]);
+    for (size_t k = 0; k < h && ok; ++k) {
+      ok = ringsApart(holes[h], holes[k]) && !inside(holes[h], holes[k][0]) &&
+           !inside(holes[k], holes[h][0]);
     }
   }
-  return true;
+  return ok;
 }
 
 }  // namespace
@@ -98,11 +84,13 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   }
   const qvtl::geometry::TriangulationResult result =
       qvtl::geometry::triangulatePolygon(outer, holes, 99999999);
+  std::vector<uint32_t> indices;
   for (const auto& t : result.triangles) {
-    for (uint32_t index : t) {
-      if (index >= result.vertices.size()) {
-        std::abort();
-      }
+    indices.insert(indices.end(), t.begin(), t.end());
+  }
+  for (uint32_t index : indices) {
+    if (index >= result.vertices.size()) {
+      std::abort();
     }
   }
   if (!valid(outer, holes)) {
@@ -112,15 +100,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   for (const PointList& hole : holes) {
     expected -= std::fabs(signedArea(hole));
   }
-  std::vector<uint32_t> indices;
-  for (const auto& t : result.triangles) {
-    indices.insert(indices.end(), t.begin(), t.end());
-  }
   const double covered = waveform_test::trianglesArea(result.vertices, indices);
-  if (std::getenv("POLYGON_FUZZ_VERBOSE") != nullptr) {
-    std::fprintf(stderr, "valid: %zu holes, %zu outer points, covered %f, expected %f\n",
-                 holes.size(), outer.size(), covered, expected);
-  }
   if (std::fabs(covered - expected) > 1e-4 * expected) {
     std::fprintf(stderr, "covered %f, expected %f\n", covered, expected);
     std::abort();

@@ -9,12 +9,9 @@
 
 namespace {
 
-using qvtl::geometry::Point2f;
-using qvtl::geometry::PointList;
-using vesk::plugin::lib::AbstractCurve;
-using vesk::plugin::lib::CubicCurve;
-using vesk::plugin::lib::LinearCurve;
-using vesk::plugin::lib::QuadraticCurve;
+using qvtl::geometry::Point2f, qvtl::geometry::PointList;
+using vesk::plugin::lib::AbstractCurve, vesk::plugin::lib::CubicCurve,
+    vesk::plugin::lib::LinearCurve, vesk::plugin::lib::QuadraticCurve;
 
 // The parameters the font flattens glyph curves with.
 constexpr float kSteps = 10.0f, kStep = 0.1f, kStep2 = 0.01f, kStep3 = 0.001f;
@@ -47,25 +44,28 @@ Point2f cubicAt(Point2f p0, Point2f c1, Point2f c2, Point2f p3, double t) {
           static_cast<float>(w0 * p0.y + w1 * c1.y + w2 * c2.y + w3 * p3.y)};
 }
 
+void expectPoints(const PointList& points, const PointList& expected, float tolerance,
+                  const std::string& name) {
+  ASSERT_EQ(points.size(), expected.size()) << name << ": " << describe(points);
+  for (size_t i = 0; i < points.size(); ++i) {
+    EXPECT_NEAR(points[i].x, expected[i].x, tolerance) << name << " point " << i;
+    EXPECT_NEAR(points[i].y, expected[i].y, tolerance) << name << " point " << i;
+  }
+}
+
 // Curves that move more than a pixel per step keep every sample: the differencing visits
 // t = 0.1 ... 0.9 and never the end point. The sums accumulate float rounding, on curves a few
 // hundred pixels wide about 1e-4 pixel: far below FreeType's 1/64 pixel resolution.
 TEST(CurveFlattening, ForwardDifferencingMatchesTheCurveAtTenthsOfT) {
   const Point2f p0{3, -40}, c{90, 160}, p2{200, 20};
   const Point2f q0{-50, 10}, c1{0, 180}, c2{160, -120}, q3{210, 60};
-  const PointList quadratic = flattened(QuadraticCurve(p0, c, p2));
-  const PointList cubic = flattened(CubicCurve(q0, c1, c2, q3));
-  ASSERT_EQ(quadratic.size(), 10u) << describe(quadratic);
-  ASSERT_EQ(cubic.size(), 10u) << describe(cubic);
-  const float rounding = 5e-4f;
+  PointList quadratic, cubic;
   for (int k = 0; k < 10; ++k) {
-    const Point2f q = quadraticAt(p0, c, p2, k / 10.0);
-    const Point2f b = cubicAt(q0, c1, c2, q3, k / 10.0);
-    EXPECT_NEAR(quadratic[k].x, q.x, rounding) << "t = " << k / 10.0;
-    EXPECT_NEAR(quadratic[k].y, q.y, rounding) << "t = " << k / 10.0;
-    EXPECT_NEAR(cubic[k].x, b.x, rounding) << "t = " << k / 10.0;
-    EXPECT_NEAR(cubic[k].y, b.y, rounding) << "t = " << k / 10.0;
+    quadratic.push_back(quadraticAt(p0, c, p2, k / 10.0));
+    cubic.push_back(cubicAt(q0, c1, c2, q3, k / 10.0));
   }
+  expectPoints(flattened(QuadraticCurve(p0, c, p2)), quadratic, 5e-4f, "quadratic");
+  expectPoints(flattened(CubicCurve(q0, c1, c2, q3)), cubic, 5e-4f, "cubic");
 }
 
 // Straight curves with evenly spaced control points move by exactly the same amount each step,
@@ -96,12 +96,7 @@ TEST(CurveFlattening, KeepsOnlySamplesMoreThanOnePixelAway) {
        {{0, 0}, {3, 0}, {6, 0}, {9, 0}, {12, 0}, {15, 0}, {18, 0}, {21, 0}, {24, 0}, {27, 0}}},
   };
   for (const Case& c : cases) {
-    const PointList points = flattened(*c.curve);
-    ASSERT_EQ(points.size(), c.expected.size()) << c.name << ": " << describe(points);
-    for (size_t i = 0; i < points.size(); ++i) {
-      EXPECT_NEAR(points[i].x, c.expected[i].x, 1e-5f) << c.name << " point " << i;
-      EXPECT_NEAR(points[i].y, c.expected[i].y, 1e-5f) << c.name << " point " << i;
-    }
+    expectPoints(flattened(*c.curve), c.expected, 1e-5f, c.name);
   }
 }
 

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 #include <limits>
+#include <tuple>
 
 #include "geometry/qv_path.h"
 #include "polygon_area.h"
@@ -36,10 +37,7 @@ TEST(Paths, CleanPathRemovesRepeatsAndSpikesButKeepsCollinearPoints) {
     Path2f path;
     path.points = c.input;
     cleanPath(path);
-    ASSERT_EQ(path.points.size(), c.expected.size()) << c.name;
-    for (size_t i = 0; i < c.expected.size(); ++i) {
-      EXPECT_EQ(path.points[i], c.expected[i]) << c.name << " point " << i;
-    }
+    EXPECT_EQ(path.points, c.expected) << c.name;
   }
 }
 
@@ -66,10 +64,8 @@ TEST(Paths, OrientationByWinding) {
 
 TEST(Paths, MakePathSetsOrientationBoundsAndId) {
   const Path2f path = makePath({{2, 1}, {2, 1}, {5, 1}, {5, 4}, {2, 4}}, 7);
-  EXPECT_EQ(path.points.size(), 4u);
-  EXPECT_EQ(path.orientation, kCounterClockwise);
-  EXPECT_EQ(path.bounds, (std::array<float, 4>{2, 1, 5, 4}));
-  EXPECT_EQ(path.id, 7u);
+  EXPECT_EQ(std::make_tuple(path.points.size(), path.orientation, path.bounds, path.id),
+            std::make_tuple(size_t{4}, kCounterClockwise, std::array<float, 4>{2, 1, 5, 4}, 7u));
 }
 
 TEST(Paths, ThousandsOfCollinearPointsStayAndKeepTheWinding) {

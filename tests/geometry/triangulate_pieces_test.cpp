@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <iterator>
 
 #include "geometry/triangulation.h"
 #include "polygon_area.h"
@@ -11,11 +12,8 @@
 namespace qvtl::geometry {
 namespace {
 
-using waveform_test::reversed;
-using waveform_test::square;
-
-using waveform_test::signedArea;
-using waveform_test::trianglesArea;
+using waveform_test::reversed, waveform_test::signedArea, waveform_test::square,
+    waveform_test::trianglesArea;
 
 CharacterOutline outlineOf(const std::vector<PointList>& contours) {
   CharacterOutline outline;
@@ -65,24 +63,14 @@ TEST(TriangulatePieces, PiecesAreConcatenatedWithOffsetIndices) {
 // may treat that turn as a spike and drop its point when the loop is cut; whatever loop the
 // shape keeps, the fill covers it exactly once.
 TEST(TriangulatePieces, HairlineSpikeIsCleanedAwayAndTheRestCoveredOnce) {
-  const PointList thin = {{32.79f, -0.99f},
-                          {22.36f, -0.96f},
-                          {10.71f, -0.91f},
-                          {-2.16f, -0.84f},
-                          {-16.25f, -0.75f},
-                          {-31.56f, -0.64f},
-                          {-48.09f, -0.51f},
-                          {-65.84f, -0.36f},
-                          {-84.81f, -0.19f},
-                          {-105, 0},
-                          {0, 0},
-                          {1.36f, -0.36f},
-                          {3.36f, -0.51f},
-                          {6.24f, -0.64f},
-                          {10, -0.75f},
-                          {14.64f, -0.84f},
-                          {20.16f, -0.91f},
-                          {26.56f, -0.96f}};
+  const float xy[] = {32.79f, -0.99f,  22.36f, -0.96f,  10.71f, -0.91f,  -2.16f, -0.84f,  -16.25f,
+                      -0.75f, -31.56f, -0.64f, -48.09f, -0.51f, -65.84f, -0.36f, -84.81f, -0.19f,
+                      -105,   0,       0,      0,       1.36f,  -0.36f,  3.36f,  -0.51f,  6.24f,
+                      -0.64f, 10,      -0.75f, 14.64f,  -0.84f, 20.16f,  -0.91f, 26.56f,  -0.96f};
+  PointList thin;
+  for (size_t i = 0; i < std::size(xy); i += 2) {
+    thin.push_back({xy[i], xy[i + 1]});
+  }
   CharacterOutline outline = outlineOf({reversed(thin)});
   const std::vector<const Shape2f*> pieces = collectFilledPieces(outline.shape);
   ASSERT_EQ(pieces.size(), 1u);

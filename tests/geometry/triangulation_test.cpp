@@ -13,11 +13,8 @@
 namespace qvtl::geometry {
 namespace {
 
-using waveform_test::reversed;
-using waveform_test::square;
-
-using waveform_test::insideRing;
-using waveform_test::signedArea;
+using waveform_test::insideRing, waveform_test::reversed, waveform_test::signedArea,
+    waveform_test::square;
 
 double coveredArea(const TriangulationResult& result) {
   std::vector<uint32_t> indices;

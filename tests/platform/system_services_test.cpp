@@ -1,6 +1,3 @@
-// The POSIX system services: locale names and the environment, the user's font folders, the fonts
-// fontconfig lists (on this machine and in a configuration of the test's own), the module folder,
-// GUIDs, the wide-space classification and UTF-8 / UTF-16 conversion.
 #include "platform/system_services.h"
 
 #include <gtest/gtest.h>
@@ -23,11 +20,8 @@ namespace waveform_test {
 namespace {
 
 namespace fs = std::filesystem;
-using platform::EnumeratedFace;
-using platform::FontHive;
-using platform::InstalledFont;
-using platform::toUtf16;
-using platform::toUtf8;
+using platform::EnumeratedFace, platform::FontHive, platform::InstalledFont, platform::toUtf16,
+    platform::toUtf8;
 
 const std::string kDejaVu = "/usr/share/fonts/truetype/dejavu/";
 const std::string kDejaVuSans = kDejaVu + "DejaVuSans.ttf";
@@ -67,11 +61,7 @@ class ScopedEnvironment {
   }
 
   static void set(const std::string& name, const std::optional<std::string>& value) {
-    if (value) {
-      setenv(name.c_str(), value->c_str(), 1);
-    } else {
-      unsetenv(name.c_str());
-    }
+    value ? setenv(name.c_str(), value->c_str(), 1) : unsetenv(name.c_str());
   }
 
  private:
@@ -90,9 +80,6 @@ void copyInto(const std::string& from, const fs::path& to) {
   fs::create_directories(to.parent_path());
   fs::copy_file(from, to, fs::copy_options::overwrite_existing);
 }
-
-// ---------------------------------------------------------------------------------------------
-// Locale names and the environment.
 
 // Codesets and unknown modifiers are ignored; a missing or unknown territory gives the
 // language's first row; aliases, BCP 47 script subtags, case and '-' for '_' are understood.
@@ -134,9 +121,6 @@ TEST(UserLanguageId, TakesLcAllThenLcMessagesThenLangOnEveryCall) {
         << lcAll.value_or("-") << " " << lcMessages.value_or("-") << " " << lang.value_or("-");
   }
 }
-
-// ---------------------------------------------------------------------------------------------
-// The user's font folders and the names of installed fonts.
 
 TEST(UserFontFolders, FollowXdgDataHomeAndHome) {
   ScopedEnvironment environment({"HOME", "XDG_DATA_HOME"});
@@ -191,9 +175,6 @@ TEST(InstalledFontName, NamesTrueTypeAndOpenTypeOutlinesOnly) {
   }
 }
 
-// ---------------------------------------------------------------------------------------------
-// The fonts installed on this machine.
-
 TEST(SystemFonts, FontDataIsTheWholeFileOfTheBestMatchingFace) {
   const std::tuple<bool, bool, std::string> cases[] = {
       {false, false, "DejaVuSans.ttf"},
@@ -208,11 +189,6 @@ TEST(SystemFonts, FontDataIsTheWholeFileOfTheBestMatchingFace) {
         << "not the bytes of " << file;
   }
 }
-
-// ---------------------------------------------------------------------------------------------
-// Fonts in a fontconfig configuration of the test's own: one machine folder and the user's
-// usual folders, with a private cache, in a temporary HOME. (The system configuration's XDG
-// folder brings in every folder of XDG_DATA_DIRS, so the user's folders are named by path.)
 
 // A one-glyph bitmap font in BDF.
 const char* const kBitmapFont = R"(STARTFONT 2.1
@@ -236,6 +212,8 @@ ENDCHAR
 ENDFONT
 )";
 
+// A configuration of the test's own with a private cache in a temporary HOME. (The system one's
+// XDG folder brings in every folder of XDG_DATA_DIRS, so the user's folders are named by path.)
 class ConfiguredFonts : public testing::Test {
  protected:
   void SetUp() override {
@@ -341,12 +319,7 @@ TEST_F(ConfiguredFonts, EmptyHivesAreEmptyLists) {
   EXPECT_TRUE(services->enumerateFamilies().empty());
 }
 
-// ---------------------------------------------------------------------------------------------
-// Module folder, GUIDs, white space, text conversion.
-
-TEST(SystemServices, IsCreatedOnceAndSharedAndKnowsItsModuleFolder) {
-  EXPECT_EQ(platform::systemServices().get(), platform::systemServices().get());
-  EXPECT_NE(platform::createSystemServices().get(), platform::systemServices().get());
+TEST(SystemServices, KnowsItsModuleFolder) {
   EXPECT_EQ(toUtf8(platform::systemServices()->moduleFolder()),
             fs::read_symlink("/proc/self/exe").parent_path().string() + "/");
 }
@@ -381,8 +354,6 @@ TEST(IsWideSpace, MatchesGlibcInAUtf8Locale) {
   }
   std::setlocale(LC_CTYPE, previous.c_str());
   EXPECT_EQ(mismatches, 0);
-  EXPECT_TRUE(services->isWideSpace(0x3000));
-  EXPECT_FALSE(services->isWideSpace(0x00A0));
 }
 
 // Each malformed sequence becomes one U+FFFD: a byte that starts none, or the longest
