@@ -21,6 +21,7 @@ inline constexpr Utf8DecodingCase kUtf8DecodingCases[] = {
     {"Az~", u"Az~"},                                    // 1 byte
     {"\xC2\xA9", u"\u00A9"},                            // 2 bytes
     {"\xE2\x82\xAC", u"\u20AC"},                        // 3 bytes
+    {"\xDF\xBF\xE0\xA0\x80", u"\u07FF\u0800"},          // the last 2-byte, the first 3-byte
     {"\xF0\x9F\x8E\xA5", u"\U0001F3A5"},                // 4 bytes, a surrogate pair in UTF-16
     {"\xF4\x8F\xBF\xBF", u"\U0010FFFF"},                // the last code point
     {"\xC0\x80", u"\uFFFD\uFFFD"},                      // overlong: C0 starts no sequence
@@ -47,6 +48,8 @@ inline constexpr Utf16EncodingCase kUtf16EncodingCases[] = {
     {u"", ""},
     {u"z\u00A9\u20AC", "z\xC2\xA9\xE2\x82\xAC"},
     {u"\U0001F3A5", "\xF0\x9F\x8E\xA5"},                      // a surrogate pair
+    {u"\u07FF\u0800", "\xDF\xBF\xE0\xA0\x80"},                // the last 2-byte, the first 3-byte
+    {u"\U0010FFFF", "\xF4\x8F\xBF\xBF"},                      // a pair ending in DFFF
     {u"\xD800", "\xEF\xBF\xBD"},                              // a high surrogate at the end
     {u"\xD800z", "\xEF\xBF\xBDz"},                            // a high surrogate before no low one
     {u"\xDC00z", "\xEF\xBF\xBDz"},                            // a low surrogate first
