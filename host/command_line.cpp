@@ -64,6 +64,9 @@ void checkOptionsFit(const CommandLine& line, bool controlSizeGiven) {
   if (!line.comparison.empty() && !renders) {
     throw UsageError("--compare is an option of render and demo");
   }
+  if (line.keepDefaults && !renders) {
+    throw UsageError("--keep-defaults is an option of render and demo");
+  }
   if (controlSizeGiven && !renders) {
     throw UsageError("--control-size is an option of render and demo");
   }
@@ -89,6 +92,8 @@ CommandLine parseCommandLine(const std::vector<std::string>& arguments) {
       line.asFloat = true;
     } else if (argument == "--pad") {
       line.pad = true;
+    } else if (argument == "--keep-defaults") {
+      line.keepDefaults = true;
     } else if (argument == "-o" || isOption(argument, "--output")) {
       line.output = optionValue(arguments, i, argument == "-o" ? "-o" : "--output");
     } else if (isOption(argument, "--compare")) {
@@ -147,7 +152,8 @@ std::string usageText() {
 commands:
   info                      print the plug-in's information and its parameter panel
   render IN.png -o OUT.png  render one frame of the picture through the effect, with the
-                            scope control attached, then draw the control
+                            scope control attached, then draw the control; the effect is
+                            told the picture is its layer first, as the editor does
   demo [-o DIR]             the same for a built-in test frame (colour bars over a grey
                             ramp); writes test-frame.png, output.png (the rendered frame) and
                             scope.png (the control) into DIR (default out/demo), and prints
@@ -174,6 +180,9 @@ render and demo options:
   --control-size WxH   the scope control's size in pixels (default 500x300)
   --float              hold 8-bit pictures in float textures (16-bit ones always are)
   --pad                allocate textures with power-of-two storage
+  --keep-defaults      keep the plug-in's defaults for the analysed rectangle (clipStartPos,
+                       clipEndPos) and the scope's corners (scopePositionTL, scopePositionBR);
+                       by default each of them not given with --set spans the whole picture
 
 Render to layer: --set blendType=Screen (or another blend) draws the scope into the frame,
 over the rectangle --set scopePositionTL=X,Y --set scopePositionBR=X,Y in frame pixels from

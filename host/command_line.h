@@ -25,6 +25,8 @@ struct CommandLine {
   std::filesystem::path output;      // render: where the output goes; demo: the folder (out/demo)
   bool asFloat = false;              // render, demo: float storage for 8-bit pictures too
   bool pad = false;                  // render, demo: power-of-two texture storage
+  bool keepDefaults = false;  // render, demo: leave the clip and the scope's corners at the
+                              // plug-in's defaults instead of spanning the picture
   std::filesystem::path comparison;  // render, demo: the comparison layer's picture, if any
   std::filesystem::path controlOutput;  // render: where the scope control's picture goes, if
                                         // anywhere

@@ -1,6 +1,8 @@
 // vtpl-host: loads an effect module the way the editor does and runs one command with it.
+#include <algorithm>
 #include <filesystem>
 #include <iostream>
+#include <sstream>
 #include <string>
 #include <utility>
 #include <vector>
@@ -62,10 +64,41 @@ int runInfo(const CommandLine& line, const PluginModule& module) {
   return 0;
 }
 
-// The size of the demo's test frame: the frame the point parameters' defaults span, so that the
-// analysis and the scope's corners cover it exactly.
+// The size of the demo's test frame: the frame the point parameters' defaults span.
 constexpr int kDemoWidth = 1280;
 constexpr int kDemoHeight = 720;
+
+std::string pointText(double x, double y) {
+  std::ostringstream text;
+  text << x << ',' << y;
+  return text.str();
+}
+
+// The editor's user drags the analysed rectangle and the scope's corners over the frame; the
+// tool's user gets them spanning the whole picture, except those given with --set, unless
+// --keep-defaults asks for the plug-in's own defaults.
+std::vector<std::pair<std::string, std::string>> pictureSpanningPoints(const CommandLine& line,
+                                                                       const Image& layer) {
+  if (line.keepDefaults) {
+    return {};
+  }
+  const double halfWidth = layer.width / 2.0;
+  const double halfHeight = layer.height / 2.0;
+  const std::pair<std::string, std::string> spanning[] = {
+      {"clipStartPos", pointText(-halfWidth, -halfHeight)},
+      {"clipEndPos", pointText(halfWidth, halfHeight)},
+      {"scopePositionTL", pointText(-halfWidth, halfHeight)},
+      {"scopePositionBR", pointText(halfWidth, -halfHeight)}};
+  std::vector<std::pair<std::string, std::string>> points;
+  for (const auto& point : spanning) {
+    const bool given = std::any_of(line.settings.begin(), line.settings.end(),
+                                   [&](const auto& setting) { return setting.first == point.first; });
+    if (!given) {
+      points.push_back(point);
+    }
+  }
+  return points;
+}
 
 struct RenderedFrame {
   Image output;
@@ -81,6 +114,14 @@ RenderedFrame renderWithControl(const CommandLine& line, const PluginModule& mod
   settings.padTextures = line.pad;
   EffectHost host(module, settings, line.trace ? &std::cerr : nullptr);
   host.open();
+  // Applied to a layer, the effect hears of its parent layer first (it follows the layer's
+  // colour space), then the user's changes arrive.
+  if (host.changeParentLayer(layer.width, layer.height) != vtpl::kResultHandled) {
+    std::cerr << "vtpl-host: warning: the effect did not take the picture as its parent layer\n";
+  }
+  for (const auto& [id, value] : pictureSpanningPoints(line, layer)) {
+    host.setValueFromText(id, value);
+  }
   for (const auto& [id, value] : line.settings) {
     host.setValueFromText(id, value);
   }

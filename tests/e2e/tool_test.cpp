@@ -225,6 +225,44 @@ TEST(Tool, RenderTakesAComparisonLayerSettingsAndTheControlPicture) {
   }
 }
 
+// As the editor applies the effect, the tool reports the picture as the effect's parent layer
+// before the first render (a 27-row picture is measured in Rec. 601), and spans the analysed
+// rectangle and the scope's corners over the picture unless --set or --keep-defaults say otherwise.
+TEST(Tool, RenderTellsTheEffectItsLayerAndSpansThePicture) {
+  const std::string in = writeTestFrame("tool_span_in.png", 48, 27);
+  const std::string out = in + ".out.png";
+  struct Case {
+    std::vector<std::string> options;
+    const char* clipStart;
+    const char* scopeBottomRight;
+  };
+  const Case cases[] = {
+      {{}, "(-24, -13.5)", "(24, -13.5)"},
+      {{"--keep-defaults"}, "(-640, -360)", "(640, -360)"},
+      {{"--set", "clipStartPos=-5,-5"}, "(-5, -5)", "(24, -13.5)"},
+  };
+  for (const Case& c : cases) {
+    std::vector<std::string> arguments = {"render", in, "-o", out, "--trace",
+                                          "--set=blendType=Screen"};
+    arguments.insert(arguments.end(), c.options.begin(), c.options.end());
+    const ToolRun run = runTool(arguments);
+    ASSERT_EQ(run.exitCode, 0) << run.err;
+    const size_t parent = run.err.find("(parameter changed) \"Effect_Parent_Layer\"\n");
+    EXPECT_LT(parent, run.err.find("> Notify 10 (render)"));
+    EXPECT_NE(run.err.find("setInt(\"colorSpace\", t=0, 601)", parent), std::string::npos);
+    EXPECT_NE(run.err.find(std::string("getPoint(\"clipStartPos\", t=0) -> ") + c.clipStart),
+              std::string::npos)
+        << c.clipStart;
+    EXPECT_NE(
+        run.err.find(std::string("getPoint(\"scopePositionBR\", t=0) -> ") + c.scopeBottomRight),
+        std::string::npos)
+        << c.scopeBottomRight;
+  }
+  for (const std::string& path : {in, out}) {
+    std::remove(path.c_str());
+  }
+}
+
 // Without -o, demo writes into out/demo of the current folder, creating it, and prints the paths.
 TEST(Tool, DemoWritesTheTestFrameTheOutputAndTheScope) {
   const std::string folder = testing::TempDir() + "/tool_demo";
