@@ -77,6 +77,8 @@ void analyseOnInterfaceThread(const HostCalls& host, ScopesEffectData& instance,
   host.call(&HostEffectRecord::fetchOwnLayer, 0, control.frameIndex, &fetched);
   Plugin::host::LayerHandle own(host, nullptr, fetched);
   if (own.empty()) {
+    // No layer for this frame: no waveform either, rather than the last frame's shown as this one's.
+    storeResult(shared, &ScopesSharedData::primary, nullptr, 1, 1);
     return;
   }
   storeFetchedResult(host, instance, settings, shared, &ScopesSharedData::primary, own.texture());

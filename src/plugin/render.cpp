@@ -90,9 +90,11 @@ void analyseAndPublish(const HostCalls& host, ScopesEffectData& instance, Scopes
   const ComparisonSettings choice = readComparisonSettings(host, frame.time);
   const LayerChoice layers = chooseLayers(!comparison.empty(), choice.type, choice.showComparison);
 
-  if (!progress.report(10)) {
-    shared.analysedFrame = frame.frameIndex;
+  // Once stopped, nothing more is analysed or stored; the fetched layer goes back all the same.
+  if (progress.report(10)) {
+    return;
   }
+  shared.analysedFrame = frame.frameIndex;
   if (layers.comparison) {
     auto waveform = analyseFrameLayer(host, instance, settings, frame, comparison.texture(),
                                       comparison.texture(), noIdentifier);
@@ -103,17 +105,18 @@ void analyseAndPublish(const HostCalls& host, ScopesEffectData& instance, Scopes
   } else {
     storeResult(shared, &ScopesSharedData::comparison, nullptr, 1, 1);
   }
-  // A fetched layer goes back to the host whether or not it was analysed.
   comparison.release();
-  progress.report(50);
-  if (layers.own && !progress.stopped()) {
+  if (progress.report(50)) {
+    return;
+  }
+  if (layers.own) {
     auto waveform = analyseFrameLayer(host, instance, settings, frame, *frame.source,
                                       *frame.destination, noIdentifier);
     if (!progress.report(80)) {
       storeResult(shared, &ScopesSharedData::primary, std::move(waveform), frame.frameWidth,
                   frame.frameHeight);
     }
-  } else if (!layers.own) {
+  } else {
     storeResult(shared, &ScopesSharedData::primary, nullptr, 1, 1);
   }
   if (frame.unwatched == 0 && !progress.stopped()) {

@@ -88,6 +88,28 @@ TEST(RenderFlow, StopAtTenLeavesTheAnalysedFrameUnchanged) {
   }
 }
 
+// Once the host stops a render at 10, nothing more is analysed or stored: with the comparison
+// layer still chosen or taken away since, the control shows the previous render's waveforms.
+TEST(RenderFlow, StoppedRenderAnalysesAndStoresNothingMore) {
+  for (const bool comparisonKept : {true, false}) {
+    SCOPED_TRACE(testing::Message() << "comparison kept " << comparisonKept);
+    auto host = std::make_unique<TracedHost>();
+    host->attachControl();
+    host->setComparisonLayer(greyPicture(16, 8));
+    host->renderFrame(greyPicture(16, 8));
+    ASSERT_EQ(host->drawControl({}), 1);
+    const Image before = host->controlPicture();
+    if (!comparisonKept) {
+      host->setComparisonLayer(Image{});
+    }
+    host->faults().stopAtProgress = 10;
+    host->renderFrame(greyPicture(16, 8));
+    EXPECT_EQ(host->analyses(), 2);
+    ASSERT_EQ(host->drawControl({}), 1);
+    EXPECT_TRUE(host->controlPicture().rgba == before.rgba) << "the control's picture changed";
+  }
+}
+
 // Which layers a render mode shows is the layout's unit tests'; here one case of each outcome,
 // analysed by the render and by the control.
 TEST(RenderFlow, ComparisonLayerIsAnalysedAsTheRenderModeAsks) {

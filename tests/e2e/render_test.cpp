@@ -168,5 +168,22 @@ TEST(ControlPicture, GreyFrameTraceSitsAtItsLevelInsideTheBlackPanel) {
   }
 }
 
+// A control that analyses a frame whose own layer the host cannot hand out shows no waveform
+// for it rather than the previous frame's as if it were this one's.
+TEST(ControlPicture, FrameWithoutOwnLayerShowsNoWaveform) {
+  auto host = openHost(glSettings());
+  host->parameters().writeBool("showGuidelines", false);
+  host->parameters().writeBool("showStandardColorBars", false);
+  host->attachControl();
+  host->renderFrame(greyPicture(32, 18));
+  // The host holds a layer for frame 0 only.
+  for (const int frame : {0, 1}) {
+    ASSERT_EQ(host->drawControl({frame, 2, true, false, 60, 50}), 1);
+    EXPECT_EQ(litRows(host->controlPicture(), 30, 0).size(), frame == 0 ? 1u : 0u)
+        << "frame " << frame;
+  }
+  EXPECT_EQ(host->callbackCount("fetchOwnLayer"), 1);
+}
+
 }  // namespace
 }  // namespace waveform_test
