@@ -19,15 +19,30 @@ using Plugin::host::HostCalls;
 
 constexpr std::array<float, 4> kPanelBlack = {0, 0, 0, 1};
 
-bool isExtended(const WaveformResult& result) {
-  return result.texture != nullptr && result.texture->internalFormat() != GL_RGBA;
-}
-
-// One waveform in its part of the panel.
+// One waveform in its part of the panel, and the rows of its texture shown there.
 struct PanelPart {
   const WaveformResult* result;
   Rectangle area;
+  TextureRows rows;
 };
+
+// Fits a waveform into the value range of the scope's graticule, so that a level reads the same
+// wherever it is drawn: the rows of a wider range than the graticule's are cut to it, and a
+// narrower range fills only its own share of the part's height.
+PanelPart fittedToRange(PanelPart part, const ValueRange& scope) {
+  const ValueRange own = waveformValueRange(part.result->texture->internalFormat());
+  const float low = std::max(own.low, scope.low);
+  const float high = std::min(own.high, scope.high);
+  const auto share = [](float value, const ValueRange& range) {
+    return (value - range.low) / (range.high - range.low);
+  };
+  const float bottom = part.area.bottom;
+  const float height = part.area.top - part.area.bottom;
+  part.area.bottom = bottom + share(low, scope) * height;
+  part.area.top = bottom + share(high, scope) * height;
+  part.rows = {share(low, own), share(high, own)};
+  return part;
+}
 
 // The parts of the panel each shown waveform fills, and the display index it is drawn with.
 std::vector<PanelPart> panelParts(const ScopeLayout& layout, const ScopeWaveforms& waveforms,
@@ -35,13 +50,13 @@ std::vector<PanelPart> panelParts(const ScopeLayout& layout, const ScopeWaveform
   switch (layout.arrangement) {
     case ScopeArrangement::kSideBySide: {
       const float middle = 0.5f * (panel.left + panel.right);
-      return {{&waveforms.primary, {panel.left, panel.bottom, middle, panel.top}},
-              {&waveforms.comparison, {middle, panel.bottom, panel.right, panel.top}}};
+      return {{&waveforms.primary, {panel.left, panel.bottom, middle, panel.top}, {}},
+              {&waveforms.comparison, {middle, panel.bottom, panel.right, panel.top}, {}}};
     }
     case ScopeArrangement::kOverlay:
-      return {{&waveforms.primary, panel}, {&waveforms.comparison, panel}};
+      return {{&waveforms.primary, panel, {}}, {&waveforms.comparison, panel, {}}};
     case ScopeArrangement::kSingle:
-      return {{layout.drawPrimary ? &waveforms.primary : &waveforms.comparison, panel}};
+      return {{layout.drawPrimary ? &waveforms.primary : &waveforms.comparison, panel, {}}};
     case ScopeArrangement::kEmpty:
     default:
       return {};
@@ -66,7 +81,7 @@ void drawWaveforms(const HostCalls& host, Plugin::gl::EffectData& programs,
       setColourMask(i == 0 ? routing.primary : routing.comparison);
     }
     drawWaveformDisplay(host, programs, parts[i].result->texture->name(), parts[i].area,
-                        displayIndexFor(settings.mode, overlay), projection,
+                        parts[i].rows, displayIndexFor(settings.mode, overlay), projection,
                         Plugin::gl::kIdentityMatrix);
   }
   glColorMask(GL_TRUE, GL_TRUE, GL_TRUE, GL_TRUE);
@@ -76,9 +91,9 @@ void drawWaveforms(const HostCalls& host, Plugin::gl::EffectData& programs,
 }
 
 // Markers over each part that has a panel of its own (the overlaid scopes share the first one's),
-// each scaled to its own waveform's frame.
+// each scaled to its own waveform's frame, at the graticule's levels.
 void drawMarkers(const HostCalls& host, Plugin::gl::EffectData& programs, int32_t colorSpace,
-                 const ScopeLayout& layout, const std::vector<PanelPart>& parts,
+                 bool extended, const ScopeLayout& layout, const std::vector<PanelPart>& parts,
                  float drawingHeight, const GraticuleFrame& frame) {
   const size_t panels = layout.arrangement == ScopeArrangement::kOverlay ? 1 : parts.size();
   for (size_t i = 0; i < panels; ++i) {
@@ -86,7 +101,7 @@ void drawMarkers(const HostCalls& host, Plugin::gl::EffectData& programs, int32_
     const float scale = result.texture != nullptr ? result.texture->scale() : 1.0f;
     drawColourBarMarkers(
         host, programs,
-        colourBarMarkers(colorSpace, isExtended(result), static_cast<float>(result.width),
+        colourBarMarkers(colorSpace, extended, static_cast<float>(result.width),
                          static_cast<float>(result.height), scale, parts[i].area.left,
                          parts[i].area.right, drawingHeight),
         frame);
@@ -111,7 +126,7 @@ void drawScope(const HostCalls& host, Plugin::gl::EffectData& programs,
   const ScopeLayout layout = decideLayout(hasPrimary, hasComparison, settings.comparison.type,
                                           hasComparison && settings.comparison.showComparison);
 
-  // The range and margins follow the waveform shown first.
+  // The graticule's range and margins follow the waveform shown first; the other is fitted to it.
   const WaveformResult* reference = layout.drawPrimary      ? &waveforms.primary
                                     : layout.drawComparison ? &waveforms.comparison
                                                             : nullptr;
@@ -139,7 +154,10 @@ void drawScope(const HostCalls& host, Plugin::gl::EffectData& programs,
     glBlendFunc(GL_ONE, GL_ONE_MINUS_SRC_ALPHA);
     fillWaveformPanel(host, programs, panel, kPanelBlack, projection, Plugin::gl::kIdentityMatrix);
   }
-  const std::vector<PanelPart> parts = panelParts(layout, waveforms, panel);
+  std::vector<PanelPart> parts = panelParts(layout, waveforms, panel);
+  for (PanelPart& part : parts) {
+    part = fittedToRange(part, waveformValueRange(extended ? GL_RGBA32F : GL_RGBA));
+  }
   drawWaveforms(host, programs, settings, layout, parts, projection);
 
   const GraticuleFrame frame = {projection, Plugin::gl::kIdentityMatrix, -margin, top};
@@ -147,7 +165,7 @@ void drawScope(const HostCalls& host, Plugin::gl::EffectData& programs,
     drawGuidelines(host, programs, guidelines, labelColumn, drawing.width, frame);
   }
   if (drawing.showColourBars && settings.mode == kModeLuminance) {
-    drawMarkers(host, programs, settings.colorSpace, layout, parts, drawingHeight, frame);
+    drawMarkers(host, programs, settings.colorSpace, extended, layout, parts, drawingHeight, frame);
   }
 }
 

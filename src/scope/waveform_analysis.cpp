@@ -134,16 +134,18 @@ struct PointPlan {
   Grid grid;
   float intensity = 0;
   GLint stencilReference = 0;
-  bool eightBitLayer = false;
+  ValueRange range;
 };
 
 PointPlan planPoints(const AnalysisSettings& settings, const AnalysisInput& input) {
   const float factor = samplingFactor(settings.downsample);
   PointPlan plan;
   plan.grid = samplingGrid(settings, input, factor);
-  plan.eightBitLayer = input.layer.format == kEightBitFormat;
+  // The range follows the waveform texture, so that a comparison layer of another bit depth
+  // than the output is measured on the same scale as the effect's own layer.
+  plan.range = waveformValueRange(input.target->internalFormat());
   plan.intensity = pointIntensity(settings.brightness, static_cast<float>(input.target->height()),
-                                  plan.eightBitLayer, static_cast<float>(input.layer.height));
+                                  plan.range, static_cast<float>(input.layer.height));
   const int32_t cap = saturationCap(plan.intensity);
   plan.stencilReference = std::min(writesAllChannels(settings.mode) ? 3 * cap : cap, 255);
   return plan;
@@ -178,8 +180,7 @@ void setAnalysisUniforms(const EffectData& programs, const AnalysisSettings& set
   programs.setUniform2i(location(shader::kGridOrigin), plan.grid.x0, plan.grid.y0);
   programs.setUniform2f(location(shader::kSamplingScale), plan.grid.sx, plan.grid.sy);
   programs.setUniform1f(location(shader::kIntensity), plan.intensity);
-  programs.setUniform2f(location(shader::kValueRange), plan.eightBitLayer ? 0.0f : -0.25f,
-                        plan.eightBitLayer ? 1.0f : 1.25f);
+  programs.setUniform2f(location(shader::kValueRange), plan.range.low, plan.range.high);
   programs.setUniform1i(location(shader::kColorSpace), settings.colorSpace);
   programs.setUniform1i(location(shader::kLinearInput), input.linearInput ? 1 : 0);
 }
@@ -254,9 +255,9 @@ uint32_t waveformTextureHeight(uint32_t outputFormat, uint32_t referenceHeight) 
   return outputFormat == kEightBitFormat ? 256u : std::max(referenceHeight, 256u);
 }
 
-float pointIntensity(float brightness, float waveformHeight, bool eightBitLayer,
+float pointIntensity(float brightness, float waveformHeight, const ValueRange& range,
                      float layerHeight) {
-  const float span = eightBitLayer ? 1.0f : 1.5f;
+  const float span = range.high - range.low;
   return brightness * 0.1f * (waveformHeight / span) / layerHeight;
 }
 

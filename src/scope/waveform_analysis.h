@@ -11,6 +11,7 @@
 #include "gl/texture.h"
 #include "host_access/host_calls.h"
 #include "scope/scope_settings.h"
+#include "scope/waveform_result.h"
 #include "vtpl/host_interface.h"
 
 namespace plugin::Scopes {
@@ -51,7 +52,8 @@ void ensureAnalysisPrograms(Plugin::gl::EffectData& programs, bool echo);
 uint32_t waveformTextureHeight(uint32_t outputFormat, uint32_t referenceHeight);
 
 // Point intensity and the stencil cap n = clamp(ceil(1 / intensity), 1, 100).
-float pointIntensity(float brightness, float waveformHeight, bool eightBitLayer, float layerHeight);
+float pointIntensity(float brightness, float waveformHeight, const ValueRange& range,
+                     float layerHeight);
 int32_t saturationCap(float intensity);
 
 // Runs the pass into the bound framebuffer. A pass left by an exception puts the GL state back

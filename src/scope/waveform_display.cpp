@@ -142,14 +142,18 @@ void ensureWaveformDisplayPrograms(EffectData& programs, bool echo) {
 
 void drawWaveformDisplay(const Plugin::host::HostCalls& host, EffectData& programs,
                          GLuint waveformTexture, const Rectangle& destination,
-                         DisplayIndex displayIndex, const Plugin::gl::Matrix4& projection,
+                         const TextureRows& rows, DisplayIndex displayIndex,
+                         const Plugin::gl::Matrix4& projection,
                          const Plugin::gl::Matrix4& modelView) {
   programs.useProgram(kCopyWaveformProgram);
   setMatrices(programs, projection, modelView);
   programs.setUniform1i(programs.uniformLocation(kWaveformSampler), 0);
   programs.setUniform1i(programs.uniformLocation(kDisplayIndexUniform), displayIndex);
   const Rectangle& d = destination;
-  const Plugin::gl::QuadVertices quad = Plugin::gl::rectangleQuad(d.left, d.bottom, d.right, d.top);
+  Plugin::gl::QuadVertices quad = Plugin::gl::rectangleQuad(d.left, d.bottom, d.right, d.top);
+  // Each vertex is (x, y, u, v), bottom edge first.
+  quad[3] = quad[7] = rows.bottom;
+  quad[11] = quad[15] = rows.top;
   Plugin::gl::bindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, waveformTexture, true);
   Plugin::gl::drawQuadArrays(host, quad.data(), 4, GL_TRIANGLE_STRIP);
   Plugin::gl::unbindTextureUnit(GL_TEXTURE0, GL_TEXTURE_2D, false);

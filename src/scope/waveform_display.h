@@ -27,11 +27,17 @@ struct Rectangle {
   float left, bottom, right, top;
 };
 
-// Draws the whole waveform texture over `destination` with the display index's colours, into the
-// bound framebuffer. Blending is the caller's.
+// The rows of a waveform texture to show, as texture coordinates from its bottom (0) to top (1).
+struct TextureRows {
+  float bottom = 0;
+  float top = 1;
+};
+
+// Draws the waveform texture's `rows` over `destination` with the display index's colours, into
+// the bound framebuffer. Blending is the caller's.
 void drawWaveformDisplay(const Plugin::host::HostCalls& host, Plugin::gl::EffectData& programs,
                          GLuint waveformTexture, const Rectangle& destination,
-                         DisplayIndex displayIndex, const Plugin::gl::Matrix4& projection,
+                         const TextureRows& rows, DisplayIndex displayIndex, const Plugin::gl::Matrix4& projection,
                          const Plugin::gl::Matrix4& modelView);
 
 // Fills `destination` with one premultiplied colour through "fillWaveformBackground", into the

@@ -16,6 +16,20 @@ struct WaveformResult {
   int32_t height = 0;
 };
 
+// The signal values a waveform's rows span, bottom to top. The waveform texture's format decides
+// it, whatever the format of the layer measured into it: an eight-bit waveform spans 0 to 1, any
+// other -0.25 to 1.25, room for super-whites and sub-blacks.
+struct ValueRange {
+  float low = 0;
+  float high = 1;
+};
+inline ValueRange waveformValueRange(uint32_t waveformFormat) {
+  return waveformFormat == GL_RGBA ? ValueRange{0.0f, 1.0f} : ValueRange{-0.25f, 1.25f};
+}
+inline bool isExtended(const WaveformResult& result) {
+  return result.texture != nullptr && result.texture->internalFormat() != GL_RGBA;
+}
+
 // The two waveforms a scope can show.
 struct ScopeWaveforms {
   WaveformResult primary;

@@ -168,6 +168,34 @@ TEST(ControlPicture, GreyFrameTraceSitsAtItsLevelInsideTheBlackPanel) {
   }
 }
 
+// An 8-bit layer and a float layer of the same grey read the same level under the one graticule,
+// side by side and overlaid (the effect's layer in red, the comparison in green), whether the
+// render or the control analyses them and whichever of the two is the float one.
+TEST(ControlPicture, LayersOfEitherBitDepthShowALevelAtTheSameHeight) {
+  for (const bool attached : {true, false}) {
+    for (const bool floatComparison : {true, false}) {
+      for (const int32_t type : {0, 1}) {
+        SCOPED_TRACE(testing::Message() << "attached " << attached << " float comparison "
+                                        << floatComparison << " type " << type);
+        auto host = openHost(glSettings());
+        host->parameters().writeBool("showGuidelines", false);
+        host->parameters().writeBool("showStandardColorBars", false);
+        host->parameters().writeInt("scopeComparisonType", type);
+        host->setComparisonLayer(greyPicture(32, 18, 0.9f), floatComparison);
+        if (attached) {
+          host->attachControl();
+        }
+        host->renderFrame(greyPicture(32, 18, 0.9f), !floatComparison);
+        ASSERT_EQ(host->drawControl(sized(60, 50)), 1);
+        const Image& picture = host->controlPicture();
+        const std::vector<int> ownRows = litRows(picture, 15, 0);
+        EXPECT_EQ(ownRows.size(), 1u);
+        EXPECT_EQ(type == 0 ? litRows(picture, 45, 0) : litRows(picture, 15, 1), ownRows);
+      }
+    }
+  }
+}
+
 // A control that analyses a frame whose own layer the host cannot hand out shows no waveform
 // for it rather than the previous frame's as if it were this one's.
 TEST(ControlPicture, FrameWithoutOwnLayerShowsNoWaveform) {

@@ -28,11 +28,11 @@ std::unique_ptr<vtpl::host::EffectHost> openHost(vtpl::host::HostSettings settin
   return host;
 }
 
-vtpl::host::Image greyPicture(int width, int height) {
+vtpl::host::Image greyPicture(int width, int height, float level) {
   vtpl::host::Image picture;
   picture.width = width;
   picture.height = height;
-  picture.rgba.assign(4 * static_cast<size_t>(width) * height, 0.5f);
+  picture.rgba.assign(4 * static_cast<size_t>(width) * height, level);
   for (size_t i = 3; i < picture.rgba.size(); i += 4) {
     picture.rgba[i] = 1.0f;
   }

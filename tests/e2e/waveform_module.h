@@ -22,8 +22,8 @@ vtpl::host::HostSettings glSettings(bool padTextures = false);
 std::unique_ptr<vtpl::host::EffectHost> openHost(
     vtpl::host::HostSettings settings = declaredStateSettings(), std::ostream* trace = nullptr);
 
-// An opaque mid-grey picture.
-vtpl::host::Image greyPicture(int width, int height);
+// An opaque grey picture, mid-grey unless another level is given.
+vtpl::host::Image greyPicture(int width, int height, float level = 0.5f);
 
 }  // namespace waveform_test
 

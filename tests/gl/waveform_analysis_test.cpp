@@ -79,7 +79,8 @@ Waveform analyse(const Frame& frame, const Settings& settings) {
 
   auto target = Plugin::gl::Texture::create();
   const uint32_t rows = waveformTextureHeight(frame.layerFormat, layer.height);
-  target->define(layer.width, rows, GL_RGBA32F, 1.0f);
+  // A waveform texture of the layer's format, as the effect's own layer gets.
+  target->define(layer.width, rows, frame.layerFormat, 1.0f);
 
   GlTestHost host;
   Plugin::gl::EffectData programs;
@@ -206,17 +207,18 @@ TEST_F(WaveformAnalysis, FloatLayerSpansMinusAQuarterToOneAndAQuarter) {
 }
 
 TEST_F(WaveformAnalysis, StencilCapsHowBrightAColumnOfIdenticalPixelsGets) {
-  EXPECT_EQ(saturationCap(pointIntensity(1.0f, 1080, false, 1080)), 15);
-  EXPECT_EQ(saturationCap(pointIntensity(0.1f, 1080, false, 1080)), 100);
-  // 64 identical pixels per column at a low brightness: intensity 0.1 x 256 / 64 x 0.25 = 0.1,
-  // so n = 10 and Luminance accepts 3n + 1 = 31 points per output pixel.
-  const Frame flat{4, 64, [](int, int) { return Pixel{0.5f, 0.5f, 0.5f, 1}; }};
+  EXPECT_EQ(saturationCap(pointIntensity(1.0f, 1080, waveformValueRange(GL_RGBA32F), 1080)), 15);
+  EXPECT_EQ(saturationCap(pointIntensity(0.1f, 1080, waveformValueRange(GL_RGBA32F), 1080)), 100);
+  // 64 identical pixels per column of a float layer at a low brightness: intensity
+  // 0.1 x (256 / 1.5) / 64 x 0.25 = 1 / 15, so n = 15 and Luminance accepts 3n + 1 = 46 points
+  // per output pixel.
+  const Frame flat{4, 64, [](int, int) { return Pixel{0.5f, 0.5f, 0.5f, 1}; }, kFloat};
   Settings dim;
   dim.brightness = 0.25f;
   const Waveform waveform = analyse(flat, dim);
   const std::vector<int> lit = waveform.litRows(0, 0);
   ASSERT_EQ(lit.size(), 1u);
-  EXPECT_NEAR(waveform.at(0, lit[0], 0), 31 * 0.1f, 1e-4);
+  EXPECT_NEAR(waveform.at(0, lit[0], 0), 46.0f / 15.0f, 1e-4);
   EXPECT_EQ(waveform.at(0, lit[0], 3), 1.0f);  // alpha keeps its largest value
 }
 

@@ -40,7 +40,7 @@ std::vector<Pixel> display(const std::vector<Pixel>& stored, DisplayIndex index,
   const float w = static_cast<float>(width);
   const float h = static_cast<float>(shownHeight);
   const Plugin::gl::Matrix4 projection = Plugin::gl::orthographicMatrix(w, h);
-  drawWaveformDisplay(host.calls(), programs, textures[0], {0, 0, w, h}, index, projection,
+  drawWaveformDisplay(host.calls(), programs, textures[0], {0, 0, w, h}, {}, index, projection,
                       Plugin::gl::kIdentityMatrix);
 
   std::vector<Pixel> shown(static_cast<size_t>(width) * shownHeight);
