@@ -12,23 +12,13 @@
 namespace Plugin::gl {
 namespace {
 
-// A copy at the layer's own size lands on texel centres only up to the rounding of the
-// interpolated coordinates, and linear filtering then mixes a trace of the neighbours into float
-// layers. Such fragments fetch their texel unfiltered, so the layer comes through bit for bit;
-// a scaled copy still filters.
-const std::string kCopyFragmentSource = R"(#version 410
+const std::string kCopyFragmentSource = std::string(R"(#version 410
 uniform sampler2D sourceTexture;
 in vec2 texCoord;
 layout(location = 0) out vec4 fragColour;
+)") + kTexelCentreSamplingSource + R"(
 void main() {
-  ivec2 size = textureSize(sourceTexture, 0);
-  vec2 texel = texCoord * vec2(size) - 0.5;
-  vec2 nearest = floor(texel + 0.5);
-  if (all(lessThan(abs(texel - nearest), vec2(1.0 / 64.0)))) {
-    fragColour = texelFetch(sourceTexture, clamp(ivec2(nearest), ivec2(0), size - 1), 0);
-  } else {
-    fragColour = texture(sourceTexture, texCoord);
-  }
+  fragColour = sampleAtTexelCentres(sourceTexture, texCoord);
 }
 )";
 

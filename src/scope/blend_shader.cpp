@@ -19,7 +19,7 @@ constexpr char kScopeRectUniform[] = "scopeRect";
 // B is the layer's premultiplied pixel and b its colour; S is the scope's pixel clamped to a
 // valid premultiplied colour, s its colour and a its alpha. Layers may hold float values outside
 // 0..1, which is why the per-channel modes guard b < 0 and b > 1 themselves.
-const char kFragmentSource[] = R"(#version 410
+const char kDeclarations[] = R"(#version 410
 uniform sampler2D layerTexture;
 uniform sampler2D scopeTexture;
 uniform int blendMode;
@@ -27,6 +27,10 @@ uniform vec4 layerRect;
 uniform vec4 scopeRect;
 in vec2 texCoord;
 layout(location = 0) out vec4 fragColour;
+)";
+
+// Where the scope is transparent, the layer comes through unchanged.
+const char kFragmentSource[] = R"(
 
 // Un-premultiplies; a colour without alpha counts as black.
 vec3 unpremultiplied(vec3 colour, float alpha) {
@@ -72,7 +76,7 @@ float colorBurn(float s, float b) {
 }
 
 void main() {
-  vec4 B = texture(layerTexture, mix(layerRect.xy, layerRect.zw, texCoord));
+  vec4 B = sampleAtTexelCentres(layerTexture, mix(layerRect.xy, layerRect.zw, texCoord));
   vec4 S = texture(scopeTexture, mix(scopeRect.xy, scopeRect.zw, texCoord));
   float a = clamp(S.a, 0.0, 1.0);
   S = vec4(clamp(S.rgb, vec3(0.0), vec3(a)), a);
@@ -129,7 +133,8 @@ void setRect(const EffectData& programs, const char* uniform, const std::array<f
 }  // namespace
 
 const std::string& blendFragmentSource() {
-  static const std::string source = kFragmentSource;
+  static const std::string source =
+      std::string(kDeclarations) + Plugin::gl::kTexelCentreSamplingSource + kFragmentSource;
   return source;
 }
 

@@ -55,28 +55,34 @@ void expectSamePicture(const Image& output, const Image& input, bool floatStorag
 }
 
 // The layer reaches the output bit for bit from exact and padded storage, 8-bit, 16-bit and 8-bit
-// uploaded as float, at odd and even sizes up to HD, also when the host stops the render.
+// uploaded as float, at odd and even sizes up to HD, also when the host stops the render, and
+// through a scope blended over the whole frame that has nothing to draw (an empty analysed
+// rectangle, no graticule, a transparent background).
 TEST(Render, LayerReachesTheOutputUnchanged) {
   struct Case {
     int width, height, bitDepth;
     bool asFloat;
     bool pad;
     int stopAt;
+    int32_t blend;
   };
   const Case cases[] = {
-      {19, 11, 8, false, false, -1},     {19, 11, 8, false, true, -1},
-      {19, 11, 16, false, true, -1},     {1280, 720, 16, false, false, -1},
-      {1281, 721, 16, false, false, -1}, {1280, 720, 8, true, false, -1},
-      {1281, 721, 8, false, false, -1},  {1920, 1080, 16, false, true, -1},
-      {19, 11, 8, false, false, 0},      {19, 11, 8, false, false, 90},
+      {19, 11, 8, false, false, -1, 0},     {19, 11, 8, false, true, -1, 0},
+      {19, 11, 16, false, true, -1, 0},     {1280, 720, 16, false, false, -1, 0},
+      {1281, 721, 16, false, false, -1, 0}, {1280, 720, 8, true, false, -1, 0},
+      {1281, 721, 8, false, false, -1, 0},  {1920, 1080, 16, false, true, -1, 0},
+      {19, 11, 8, false, false, 0, 0},      {19, 11, 8, false, false, 90, 0},
+      {1280, 720, 16, false, false, -1, 1},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(testing::Message() << c.width << "x" << c.height << " bit depth " << c.bitDepth
                                     << " float " << c.asFloat << " pad " << c.pad << " stop at "
-                                    << c.stopAt);
+                                    << c.stopAt << " blend " << c.blend);
     const Image input = randomPicture(c.width, c.height, c.bitDepth, 5);
     auto host = openHost(glSettings(c.pad));
     host->faults().stopAtProgress = c.stopAt;
+    host->setValueFromText("blendType", std::to_string(c.blend));
+    host->setValueFromText("clipEndPos", "-640,-360");
     expectSamePicture(host->renderFrame(input, c.asFloat), input, c.asFloat || c.bitDepth == 16);
   }
 }
