@@ -154,9 +154,11 @@ void drawScope(const HostCalls& host, Plugin::gl::EffectData& programs,
     glBlendFunc(GL_ONE, GL_ONE_MINUS_SRC_ALPHA);
     fillWaveformPanel(host, programs, panel, kPanelBlack, projection, Plugin::gl::kIdentityMatrix);
   }
+  const ValueRange graticuleRange =
+      extended ? waveformValueRange(reference->texture->internalFormat()) : ValueRange{};
   std::vector<PanelPart> parts = panelParts(layout, waveforms, panel);
   for (PanelPart& part : parts) {
-    part = fittedToRange(part, waveformValueRange(extended ? GL_RGBA32F : GL_RGBA));
+    part = fittedToRange(part, graticuleRange);
   }
   drawWaveforms(host, programs, settings, layout, parts, projection);
 
