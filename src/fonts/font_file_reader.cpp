@@ -62,7 +62,6 @@ constexpr size_t kHeadSize = 54;
 
 constexpr uint16_t kUnicodePlatform = 0;
 constexpr uint16_t kWindowsPlatform = 3;
-constexpr uint16_t kEnglishMacintoshCode = 0;
 
 // The name IDs kept besides those the named instances refer to.
 constexpr uint16_t kKeptNameIds[] = {1, 2, 3, 4, 6, 16, 17, 19, 25};
@@ -275,38 +274,23 @@ void readNames(const ByteReader& file, const TableLocation& table,
   }
 }
 
-// The Windows-platform text of a name ID for the user's language: the only language there is;
-// else the user's own language; else the first language with the same Macintosh language code
-// (which lets related languages, and languages without a Macintosh counterpart, stand in for
-// one another); else the first English one; else the first. Null when there is none.
+// The Windows-platform text of a name ID in the language platform::preferredNameLanguage picks
+// for the user. Null when there is none.
 const std::string* chooseName(const NameTable& names, uint16_t nameID, uint16_t userLanguageId) {
-  const auto platform = names.find(kWindowsPlatform);
-  if (platform == names.end()) {
+  const auto windows = names.find(kWindowsPlatform);
+  if (windows == names.end()) {
     return nullptr;
   }
-  const auto id = platform->second.find(nameID);
-  if (id == platform->second.end() || id->second.empty()) {
+  const auto id = windows->second.find(nameID);
+  if (id == windows->second.end() || id->second.empty()) {
     return nullptr;
   }
   const std::map<uint16_t, std::string>& byLanguage = id->second;
-  if (byLanguage.size() == 1) {
-    return &byLanguage.begin()->second;
+  std::vector<uint16_t> languages;
+  for (const auto& entry : byLanguage) {
+    languages.push_back(entry.first);
   }
-  if (const auto exact = byLanguage.find(userLanguageId); exact != byLanguage.end()) {
-    return &exact->second;
-  }
-  const uint16_t userCode = macintoshLanguageCode(userLanguageId);
-  for (const auto& [languageID, text] : byLanguage) {
-    if (macintoshLanguageCode(languageID) == userCode) {
-      return &text;
-    }
-  }
-  for (const auto& [languageID, text] : byLanguage) {
-    if (macintoshLanguageCode(languageID) == kEnglishMacintoshCode) {
-      return &text;
-    }
-  }
-  return &byLanguage.begin()->second;
+  return &byLanguage.at(languages[platform::preferredNameLanguage(languages, userLanguageId)]);
 }
 
 // Fills in the names of a face's named instances from its name table. The copies are charged to

@@ -12,6 +12,8 @@
 #include <string>
 #include <vector>
 
+#include "platform/system_services.h"
+
 namespace vesk::project {
 
 // One named instance of a variable font, from its 'fvar' table.
@@ -90,9 +92,7 @@ class FontFileReader {
   std::vector<Face> faces_;
 };
 
-// The Macintosh language code of a Windows language identifier: 0 (English) for identifiers
-// without an entry, 65535 for languages without a Macintosh counterpart.
-uint16_t macintoshLanguageCode(uint16_t windowsLanguageId);
+using platform::macintoshLanguageCode;
 
 // UTF-8 to UTF-16; malformed sequences become U+FFFD.
 std::u16string utf8ToUtf16(const std::string& text);
