@@ -2,9 +2,12 @@
 // tests write) and on this machine.
 #include "fonts/font_cache.h"
 
+#include <fontconfig/fontconfig.h>
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <filesystem>
+#include <fstream>
 #include <map>
 #include <set>
 #include <string>
@@ -328,6 +331,62 @@ TEST(FontCacheOnThisMachine, EveryDejaVuFaceIsFoundByEachOfItsNames) {
     }
   }
   EXPECT_GE(faces, 6);
+}
+
+// The TrueType and OpenType files (collections included) fontconfig lists on this machine.
+std::set<std::string> listedOutlineFiles() {
+  std::set<std::string> files;
+  FcPattern* everything = FcPatternCreate();
+  FcObjectSet* objects = FcObjectSetBuild(FC_FILE, FC_FONTFORMAT, nullptr);
+  FcFontSet* listed = FcFontList(nullptr, everything, objects);
+  for (int i = 0; listed != nullptr && i < listed->nfont; ++i) {
+    FcChar8* file = nullptr;
+    FcChar8* format = nullptr;
+    if (FcPatternGetString(listed->fonts[i], FC_FILE, 0, &file) == FcResultMatch &&
+        FcPatternGetString(listed->fonts[i], FC_FONTFORMAT, 0, &format) == FcResultMatch &&
+        (std::string(reinterpret_cast<char*>(format)) == "TrueType" ||
+         std::string(reinterpret_cast<char*>(format)) == "CFF")) {
+      files.insert(reinterpret_cast<char*>(file));
+    }
+  }
+  FcFontSetDestroy(listed);
+  FcObjectSetDestroy(objects);
+  FcPatternDestroy(everything);
+  return files;
+}
+
+// Every record has a file and every listed file a record, in the user's language too: the
+// installed-font lists and the enumeration must name each face alike. Debian's URW fonts come as
+// Type 1 and OpenType files of the same names; the WenQuanYi faces have Chinese names. A file
+// whose every face repeats the PostScript name of another file's face cannot have a record of
+// its own, as records are told apart by that name.
+TEST(FontCacheOnThisMachine, EveryRecordHasAFileAndEveryListedFileARecordInEachLocale) {
+  REQUIRE_FILE("/usr/share/fonts/opentype/urw-base35/NimbusSans-Regular.otf");
+  REQUIRE_FILE("/usr/share/fonts/truetype/wqy/wqy-microhei.ttc");
+  const char* const saved = std::getenv("LC_ALL");
+  const std::set<std::string> listed = listedOutlineFiles();
+  for (const char* locale : {"C", "zh_CN.UTF-8", "zh_TW.UTF-8"}) {
+    setenv("LC_ALL", locale, 1);
+    FontCache cache(platform::createSystemServices());
+    std::set<std::string> files;
+    std::set<std::u16string> postScriptNames;
+    for (const FontRecord& record : cache.records()) {
+      EXPECT_TRUE(std::ifstream(toUtf8(record.filePath)).good())
+          << locale << ": " << toUtf8(record.postScriptName) << " has no readable file";
+      files.insert(toUtf8(record.filePath));
+      postScriptNames.insert(record.postScriptName);
+    }
+    for (const std::string& file : listed) {
+      const vesk::project::FontFileReader reader(toUtf16(file), 0x0409);
+      bool repeated = reader.faceCount() > 0;
+      for (int32_t face = 0; face < reader.faceCount(); ++face) {
+        repeated = repeated && postScriptNames.count(reader.postScriptNameUtf16(face)) > 0;
+      }
+      EXPECT_TRUE(files.count(file) > 0 || repeated) << locale << ": " << file;
+    }
+    EXPECT_FALSE(cache.findFont(u"No Such Font", u"", u"").filePath.empty()) << locale;
+  }
+  saved != nullptr ? setenv("LC_ALL", saved, 1) : unsetenv("LC_ALL");
 }
 
 }  // namespace
