@@ -21,6 +21,7 @@ struct FontFileReader::Face {
   NameTable names;
   std::vector<NamedInstance> instances;
   bool embeddable = false;  // stays false without an OS/2 table
+  FontFileReader::StyleClass styleClass;
   int16_t subscriptXSize = 0;
   int16_t subscriptYSize = 0;
   int16_t subscriptXOffset = 0;
@@ -57,6 +58,7 @@ constexpr uint16_t kMinimumInstanceSize = 4;
 
 // How much of each table is read; the rest of a longer table is not needed.
 constexpr size_t kOs2Size = 100;
+constexpr uint16_t kSlantedBits = 0x0001 | 0x0200;  // fsSelection ITALIC, OBLIQUE
 constexpr size_t kPostSize = 32;
 constexpr size_t kHeadSize = 54;
 
@@ -151,7 +153,10 @@ std::array<uint8_t, N> readArea(const ByteReader& file, const TableLocation& tab
 void readOs2(const ByteReader& file, const TableLocation& table, FontFileReader::Face& face) {
   const auto area = readArea<kOs2Size>(file, table);
   const ByteReader os2(area.data(), area.size());
-  face.embeddable = (os2.u16(8) & kNoEmbeddingBits) == 0;  // fsType
+  face.embeddable = (os2.u16(8) & kNoEmbeddingBits) == 0;       // fsType
+  face.styleClass.weight = os2.u16(4);                          // usWeightClass
+  face.styleClass.width = os2.u16(6);                           // usWidthClass
+  face.styleClass.slanted = (os2.u16(62) & kSlantedBits) != 0;  // fsSelection
   face.subscriptXSize = os2.s16(10);
   face.subscriptYSize = os2.s16(12);
   face.subscriptXOffset = os2.s16(14);
@@ -541,6 +546,11 @@ const std::vector<NamedInstance>& FontFileReader::namedInstances(int32_t faceInd
   static const std::vector<NamedInstance> empty;
   const Face* found = face(faceIndex);
   return found ? found->instances : empty;
+}
+
+FontFileReader::StyleClass FontFileReader::styleClass(int32_t faceIndex) const {
+  const Face* found = face(faceIndex);
+  return found ? found->styleClass : StyleClass{};
 }
 
 bool FontFileReader::isEmbeddable(int32_t faceIndex) const {

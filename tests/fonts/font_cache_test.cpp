@@ -103,13 +103,18 @@ class FontCacheOnFakeSystem : public testing::Test {
                  const std::u16string& fullName, int32_t type = platform::kTrueTypeFontType) {
     system_->faces.push_back({family, style, fullName, type});
   }
-  // A family of faces, each in its own file in the fonts folder, installed and enumerated.
-  void addFamily(const std::u16string& family, const std::vector<std::u16string>& styles) {
+  // A family of faces, each in its own file in the fonts folder, installed and enumerated; the
+  // OS/2 fields of a style as given, else the defaults (weight 400, normal width, upright).
+  void addFamily(const std::u16string& family, const std::vector<std::u16string>& styles,
+                 const std::map<std::u16string, Os2Fields>& os2 = {}) {
     for (const std::u16string& style : styles) {
       const std::u16string postScript = family + u"-" + style;
       const std::u16string full = family + u" " + style;
       const std::string file = toUtf8(postScript) + ".ttf";
-      writeFont("fonts/" + file, family, style, full, postScript);
+      const auto fields = os2.find(style);
+      writeBytes("fonts/" + file, namedFont(family, style, full, postScript)
+                                      .setOs2(fields != os2.end() ? fields->second : Os2Fields{})
+                                      .build());
       install(FontHive::kMachine, full + u" (TrueType)", toUtf16(file));
       enumerate(family, style, full);
     }
@@ -225,7 +230,14 @@ TEST_F(FontCacheOnFakeSystem, UserFontReplacesAMachineFontOfTheSameName) {
 
 TEST_F(FontCacheOnFakeSystem, LookupsTryPostScriptThenFullNamesThenFamily) {
   addFamily(u"Fam", {u"Bold", u"Regular", u"Italic"});
-  addFamily(u"Other", {u"Bold", u"Black"});  // no regular face: the family names its first
+  addFamily(u"Other", {u"Bold", u"Black"});  // no "Regular" face, equally regular: the first
+  // No "Regular" face: the upright face of weight 400 and normal width, wherever it comes.
+  Os2Fields bold, condensed, italic;
+  bold.weightClass = 700;
+  condensed.widthClass = 3;
+  italic.fsSelection = 1;
+  addFamily(u"Serif", {u"Bold", u"Condensed", u"Italic", u"Roman"},
+            {{u"Bold", bold}, {u"Condensed", condensed}, {u"Italic", italic}});
   FontCache cache(system_);
   EXPECT_TRUE(cache.hasFont(u"", u"Other", u"nothing"));
   EXPECT_FALSE(cache.hasFont(u"nothing", u"No Such Family", u"nothing"));
@@ -239,6 +251,7 @@ TEST_F(FontCacheOnFakeSystem, LookupsTryPostScriptThenFullNamesThenFamily) {
       {u"x", u"", u"Fam Bold", u"Fam-Bold"},
       {u"x", u"Fam", u"y", u"Fam-Regular"},  // only the family matches
       {u"", u"Other", u"nothing else", u"Other-Black"},
+      {u"", u"Serif", u"nothing at all", u"Serif-Roman"},
   };
   for (const Case& c : cases) {
     EXPECT_EQ(cache.findFont(c.postScript, c.family, c.full).postScriptName, c.expected)
