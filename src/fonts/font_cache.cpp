@@ -1,7 +1,9 @@
 #include "fonts/font_cache.h"
 
+#include <cstdlib>
 #include <cwctype>
 #include <stdexcept>
+#include <tuple>
 
 namespace vesk::project {
 namespace {
@@ -18,6 +20,16 @@ bool isEnumerable(const platform::EnumeratedFace& face) {
 
 bool isRegularStyle(const std::u16string& style) {
   return style.empty() || style == u"Regular";
+}
+
+// How far a face is from the upright, normal-width face of weight 400: a face without a file
+// farthest, then a named instance, then a slanted face, then by weight, then by width.
+using Irregularity = std::tuple<bool, bool, bool, int, int>;
+Irregularity irregularityOf(const FontRecord& record, const FontFileReader* reader) {
+  const FontFileReader::StyleClass style =
+      reader != nullptr ? reader->styleClass(record.faceIndex) : FontFileReader::StyleClass{};
+  return {reader == nullptr, record.instanceId != 0, style.slanted, std::abs(style.weight - 400),
+          std::abs(style.width - 5)};
 }
 
 // The record an enumeration reports before anything is read from the file.
@@ -239,6 +251,8 @@ void FontCache::addEnumeratedFace(const platform::EnumeratedFace& face, bool rea
 
 void FontCache::index(std::map<std::u16string, FontRecord>& loaded) {
   records_.reserve(loaded.size());
+  std::set<std::u16string> withRegularStyle;
+  std::map<std::u16string, Irregularity> named;  // of the face a family names, while it has none
   for (auto& [postScriptName, record] : loaded) {
     const auto at = static_cast<int32_t>(records_.size());
     if (!record.postScriptName.empty()) {
@@ -250,10 +264,20 @@ void FontCache::index(std::map<std::u16string, FontRecord>& loaded) {
     if (!record.gdiFullName.empty()) {
       byGdiFullName_[record.gdiFullName] = at;
     }
-    // A family names its last regular face, or its first face when it has none.
-    const auto family = byFamily_.find(record.familyName);
-    if (family == byFamily_.end() || isRegularStyle(record.styleName)) {
+    // A family names its last face styled "Regular" (or not styled). A family without one, such
+    // as one whose regular face is its "Roman" or "Book", names its most regular face, the
+    // first of equals.
+    if (isRegularStyle(record.styleName)) {
+      withRegularStyle.insert(record.familyName);
       byFamily_[record.familyName] = at;
+    } else if (withRegularStyle.count(record.familyName) == 0) {
+      const Irregularity irregularity =
+          irregularityOf(record, record.filePath.empty() ? nullptr : &readerFor(record.filePath));
+      const auto best = named.find(record.familyName);
+      if (best == named.end() || irregularity < best->second) {
+        named[record.familyName] = irregularity;
+        byFamily_[record.familyName] = at;
+      }
     }
     familyNames_.insert(record.familyName);
     records_.push_back(std::move(record));

@@ -21,6 +21,7 @@ struct FontFileReader::Face {
   NameTable names;
   std::vector<NamedInstance> instances;
   bool embeddable = false;  // stays false without an OS/2 table
+  FontFileReader::StyleClass styleClass;
   int16_t subscriptXSize = 0;
   int16_t subscriptYSize = 0;
   int16_t subscriptXOffset = 0;
@@ -57,12 +58,12 @@ constexpr uint16_t kMinimumInstanceSize = 4;
 
 // How much of each table is read; the rest of a longer table is not needed.
 constexpr size_t kOs2Size = 100;
+constexpr uint16_t kSlantedBits = 0x0001 | 0x0200;  // fsSelection ITALIC, OBLIQUE
 constexpr size_t kPostSize = 32;
 constexpr size_t kHeadSize = 54;
 
 constexpr uint16_t kUnicodePlatform = 0;
 constexpr uint16_t kWindowsPlatform = 3;
-constexpr uint16_t kEnglishMacintoshCode = 0;
 
 // The name IDs kept besides those the named instances refer to.
 constexpr uint16_t kKeptNameIds[] = {1, 2, 3, 4, 6, 16, 17, 19, 25};
@@ -152,7 +153,10 @@ std::array<uint8_t, N> readArea(const ByteReader& file, const TableLocation& tab
 void readOs2(const ByteReader& file, const TableLocation& table, FontFileReader::Face& face) {
   const auto area = readArea<kOs2Size>(file, table);
   const ByteReader os2(area.data(), area.size());
-  face.embeddable = (os2.u16(8) & kNoEmbeddingBits) == 0;  // fsType
+  face.embeddable = (os2.u16(8) & kNoEmbeddingBits) == 0;       // fsType
+  face.styleClass.weight = os2.u16(4);                          // usWeightClass
+  face.styleClass.width = os2.u16(6);                           // usWidthClass
+  face.styleClass.slanted = (os2.u16(62) & kSlantedBits) != 0;  // fsSelection
   face.subscriptXSize = os2.s16(10);
   face.subscriptYSize = os2.s16(12);
   face.subscriptXOffset = os2.s16(14);
@@ -275,38 +279,23 @@ void readNames(const ByteReader& file, const TableLocation& table,
   }
 }
 
-// The Windows-platform text of a name ID for the user's language: the only language there is;
-// else the user's own language; else the first language with the same Macintosh language code
-// (which lets related languages, and languages without a Macintosh counterpart, stand in for
-// one another); else the first English one; else the first. Null when there is none.
+// The Windows-platform text of a name ID in the language platform::preferredNameLanguage picks
+// for the user. Null when there is none.
 const std::string* chooseName(const NameTable& names, uint16_t nameID, uint16_t userLanguageId) {
-  const auto platform = names.find(kWindowsPlatform);
-  if (platform == names.end()) {
+  const auto windows = names.find(kWindowsPlatform);
+  if (windows == names.end()) {
     return nullptr;
   }
-  const auto id = platform->second.find(nameID);
-  if (id == platform->second.end() || id->second.empty()) {
+  const auto id = windows->second.find(nameID);
+  if (id == windows->second.end() || id->second.empty()) {
     return nullptr;
   }
   const std::map<uint16_t, std::string>& byLanguage = id->second;
-  if (byLanguage.size() == 1) {
-    return &byLanguage.begin()->second;
+  std::vector<uint16_t> languages;
+  for (const auto& entry : byLanguage) {
+    languages.push_back(entry.first);
   }
-  if (const auto exact = byLanguage.find(userLanguageId); exact != byLanguage.end()) {
-    return &exact->second;
-  }
-  const uint16_t userCode = macintoshLanguageCode(userLanguageId);
-  for (const auto& [languageID, text] : byLanguage) {
-    if (macintoshLanguageCode(languageID) == userCode) {
-      return &text;
-    }
-  }
-  for (const auto& [languageID, text] : byLanguage) {
-    if (macintoshLanguageCode(languageID) == kEnglishMacintoshCode) {
-      return &text;
-    }
-  }
-  return &byLanguage.begin()->second;
+  return &byLanguage.at(languages[platform::preferredNameLanguage(languages, userLanguageId)]);
 }
 
 // Fills in the names of a face's named instances from its name table. The copies are charged to
@@ -557,6 +546,11 @@ const std::vector<NamedInstance>& FontFileReader::namedInstances(int32_t faceInd
   static const std::vector<NamedInstance> empty;
   const Face* found = face(faceIndex);
   return found ? found->instances : empty;
+}
+
+FontFileReader::StyleClass FontFileReader::styleClass(int32_t faceIndex) const {
+  const Face* found = face(faceIndex);
+  return found ? found->styleClass : StyleClass{};
 }
 
 bool FontFileReader::isEmbeddable(int32_t faceIndex) const {

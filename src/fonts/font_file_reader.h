@@ -12,6 +12,8 @@
 #include <string>
 #include <vector>
 
+#include "platform/system_services.h"
+
 namespace vesk::project {
 
 // One named instance of a variable font, from its 'fvar' table.
@@ -64,6 +66,14 @@ class FontFileReader {
   const std::vector<NamedInstance>& namedInstances(int32_t face) const;
   // Whether the OS/2 table permits embedding; false for a face out of range.
   bool isEmbeddable(int32_t face) const;
+  // How the face is drawn, from OS/2; zero classes and upright without the table.
+  struct StyleClass {
+    uint16_t weight = 0;   // 400 regular, 700 bold
+    uint16_t width = 0;    // 5 normal, below condensed, above expanded
+    bool slanted = false;  // the italic or the oblique bit of fsSelection
+  };
+  // All zero for a face out of range.
+  StyleClass styleClass(int32_t face) const;
 
   // Metrics in em. A face out of range, or without a usable unitsPerEm, gives the defaults
   // (subscript size 0.583, 0.583; offset 0, -0.1914; superscript size 0.583, 0.583; offset 0,
@@ -90,9 +100,7 @@ class FontFileReader {
   std::vector<Face> faces_;
 };
 
-// The Macintosh language code of a Windows language identifier: 0 (English) for identifiers
-// without an entry, 65535 for languages without a Macintosh counterpart.
-uint16_t macintoshLanguageCode(uint16_t windowsLanguageId);
+using platform::macintoshLanguageCode;
 
 // UTF-8 to UTF-16; malformed sequences become U+FFFD.
 std::u16string utf8ToUtf16(const std::string& text);

@@ -1,6 +1,9 @@
 #include "platform/fontconfig_fonts.h"
 
 #include <fontconfig/fontconfig.h>
+#include <ft2build.h>
+#include FT_FREETYPE_H
+#include FT_SFNT_NAMES_H
 
 #include <algorithm>
 #include <cmath>
@@ -25,7 +28,8 @@ constexpr size_t kFaceNameUnits = 31;
 
 // One face (or named instance) fontconfig lists. The names are chosen once: the family is the
 // first English family name, the style the first English style, the full name the first English
-// full name that starts with the family.
+// full name that starts with the family. The enumeration names the face by the full names of
+// the file's Windows name table instead when it has them (see enumeratedFullName).
 struct Face {
   std::string file;  // absolute
   int index = 0;     // face index, with the named instance in the upper 16 bits
@@ -41,7 +45,8 @@ struct Face {
   std::u16string family;
   std::u16string style;
   std::u16string fullName;
-  FcPattern* pattern = nullptr;  // owned by the listed font set
+  std::map<uint16_t, std::u16string> windowsFullNames;  // name ID 4 by Windows language ID
+  FcPattern* pattern = nullptr;                         // owned by the listed font set
 };
 
 std::vector<std::string> stringsOf(FcPattern* pattern, const char* object) {
@@ -101,10 +106,19 @@ std::u16string joined(const std::u16string& first, const std::u16string& second)
   return first + u' ' + second;
 }
 
+// A named instance's full name: its font's and its own style, the form the font catalogue keys
+// instances by. Fontconfig gives a named instance the full name of its font.
+std::u16string withInstanceStyle(const std::u16string& fullName, const Face& face) {
+  if (face.namedInstance && !face.style.empty() && fullName != face.style &&
+      !endsWith(fullName, u' ' + face.style)) {
+    return joined(fullName, face.style);
+  }
+  return fullName;
+}
+
 // The face's full name: the first English full name that starts with its family (a collection
 // face may list its sibling's name first), else the first English one, else any, else family and
-// style. Fontconfig gives a named instance the full name of its font; the instance's own is that
-// name and the instance's style, the form the font catalogue keys instances by.
+// style; a named instance's with its style.
 std::u16string fullNameOf(FcPattern* pattern, const Face& face) {
   const std::vector<std::u16string> english = englishValues(pattern, FC_FULLNAME, FC_FULLNAMELANG);
   std::u16string fullName;
@@ -120,11 +134,24 @@ std::u16string fullNameOf(FcPattern* pattern, const Face& face) {
   if (fullName.empty()) {
     return joined(face.family, face.style);
   }
-  if (face.namedInstance && !face.style.empty() && fullName != face.style &&
-      !endsWith(fullName, u' ' + face.style)) {
-    return joined(fullName, face.style);
+  return withInstanceStyle(fullName, face);
+}
+
+// The full name the enumeration reports, as the installed-font lists' files name the face: the
+// Windows-platform full name in the language the font file reader picks for the user. Fontconfig's
+// own choice can be another name: the Macintosh table's ("Nimbus Sans Bold" where the Windows
+// table says "NimbusSans-Bold"), or English where the user reads Chinese. The catalogue finds a
+// face's file by this name, so it must be the file's own.
+std::u16string enumeratedFullName(const Face& face, uint16_t userLanguageId) {
+  if (face.windowsFullNames.empty()) {
+    return face.fullName;
   }
-  return fullName;
+  std::vector<uint16_t> languages;
+  for (const auto& entry : face.windowsFullNames) {
+    languages.push_back(entry.first);
+  }
+  const uint16_t language = languages[preferredNameLanguage(languages, userLanguageId)];
+  return withInstanceStyle(face.windowsFullNames.at(language), face);
 }
 
 // A face from one listed pattern; none for the pattern of a whole variable font, which is no
@@ -191,6 +218,15 @@ std::u16string styleFor(const Face& face, const std::u16string& family) {
     }
   }
   return face.style;
+}
+
+// Whether the enumeration reports the face: a face of a file the installed-font lists name, or a
+// bitmap-only face (as a raster face). Other outline formats, such as Type 1, are left out: no
+// list names their files, so the catalogue could give them none. (Debian installs the same
+// families as Type 1 and as OpenType; listing the Type 1 faces would also hide the OpenType
+// faces of the same names.)
+bool isEnumerated(const Face& face) {
+  return !face.outline || installedFontName(face.family, face.style, face.format, true);
 }
 
 int32_t fontTypeOf(const Face& face) {
@@ -285,6 +321,64 @@ std::vector<Face> facesOf(FcFontSet* listed) {
   return faces;
 }
 
+// The full names (name ID 4) of the Windows name table of a file's face, by language, read as
+// the font file reader reads them: a later record of a language replaces an earlier one, a text
+// ends at its first zero unit, and one that is not well-formed UTF-16 is passed over.
+std::map<uint16_t, std::u16string> windowsFullNames(FT_Library library, const std::string& file,
+                                                    int faceIndex) {
+  constexpr FT_UShort kWindowsPlatform = 3;
+  constexpr FT_UShort kFullNameId = 4;
+  std::map<uint16_t, std::u16string> names;
+  FT_Face face = nullptr;
+  if (library == nullptr || FT_New_Face(library, file.c_str(), faceIndex, &face) != 0) {
+    return names;
+  }
+  const FT_UInt count = FT_IS_SFNT(face) ? FT_Get_Sfnt_Name_Count(face) : 0;
+  for (FT_UInt i = 0; i < count; ++i) {
+    FT_SfntName name{};
+    if (FT_Get_Sfnt_Name(face, i, &name) != 0 || name.platform_id != kWindowsPlatform ||
+        name.name_id != kFullNameId) {
+      continue;
+    }
+    std::u16string text;
+    for (FT_UInt at = 0; at < name.string_len; at += 2) {
+      const uint8_t low = at + 1 < name.string_len ? name.string[at + 1] : 0;
+      const auto unit = static_cast<char16_t>((name.string[at] << 8) | low);
+      if (unit == 0) {
+        break;
+      }
+      text += unit;
+    }
+    if (!text.empty() && toUtf8Strict(text)) {
+      names[name.language_id] = std::move(text);
+    }
+  }
+  FT_Done_Face(face);
+  return names;
+}
+
+// Reads the Windows full names of every face the enumeration reports by them; the named
+// instances of a face share its names.
+void readWindowsFullNames(std::vector<Face>& faces) {
+  FT_Library library = nullptr;
+  if (FT_Init_FreeType(&library) != 0) {
+    return;
+  }
+  std::map<std::pair<std::string, int>, std::map<uint16_t, std::u16string>> read;
+  for (Face& face : faces) {
+    if (!face.outline || !isEnumerated(face)) {
+      continue;
+    }
+    const std::pair<std::string, int> key(face.file, face.index & 0xFFFF);
+    auto found = read.find(key);
+    if (found == read.end()) {
+      found = read.emplace(key, windowsFullNames(library, key.first, key.second)).first;
+    }
+    face.windowsFullNames = found->second;
+  }
+  FT_Done_FreeType(library);
+}
+
 std::vector<uint8_t> fileBytes(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   if (!in) {
@@ -368,6 +462,7 @@ FontconfigFonts::FontconfigFonts() : state_(std::make_unique<State>()) {
   FcObjectSetDestroy(objects);
   FcPatternDestroy(everything);
   state_->faces = facesOf(state_->listed);
+  readWindowsFullNames(state_->faces);
   state_->fontsFolder =
       chooseFontsFolder(fontDirectories(state_->config), state_->userFolders, state_->faces);
 }
@@ -412,7 +507,7 @@ std::optional<std::vector<InstalledFont>> FontconfigFonts::installedFonts(FontHi
 std::vector<EnumeratedFace> FontconfigFonts::families() const {
   std::map<std::u16string, const Face*> chosen;
   for (const Face& face : state_->faces) {
-    if (face.family.empty()) {
+    if (face.family.empty() || !isEnumerated(face)) {
       continue;
     }
     const Face*& best = chosen[face.family];
@@ -420,9 +515,11 @@ std::vector<EnumeratedFace> FontconfigFonts::families() const {
       best = &face;
     }
   }
+  const uint16_t language = userLanguageIdFromEnvironment();
   std::vector<EnumeratedFace> families;
   for (const auto& [family, face] : chosen) {
-    families.push_back({family, face->style, face->fullName, fontTypeOf(*face)});
+    families.push_back(
+        {family, face->style, enumeratedFullName(*face, language), fontTypeOf(*face)});
   }
   return families;
 }
@@ -430,13 +527,15 @@ std::vector<EnumeratedFace> FontconfigFonts::families() const {
 std::vector<EnumeratedFace> FontconfigFonts::faces(const std::u16string& faceName) const {
   const std::u16string key = faceNameKey(faceName);
   std::vector<EnumeratedFace> faces;
+  const uint16_t language = userLanguageIdFromEnvironment();
   std::set<std::tuple<std::u16string, std::u16string, std::u16string>> seen;
   for (const Face& face : state_->faces) {
     const std::optional<std::u16string> family = familyMatching(face, key);
-    if (!family) {
+    if (!family || !isEnumerated(face)) {
       continue;
     }
-    EnumeratedFace found{*family, styleFor(face, *family), face.fullName, fontTypeOf(face)};
+    EnumeratedFace found{*family, styleFor(face, *family), enumeratedFullName(face, language),
+                         fontTypeOf(face)};
     if (seen.emplace(found.faceName, found.style, found.fullName).second) {
       faces.push_back(std::move(found));
     }

@@ -31,6 +31,9 @@ class FontconfigFonts {
   std::optional<std::u16string> fontsFolder() const;
   // One entry per TrueType or CFF-based outline file of the hive; none without a configuration.
   std::optional<std::vector<InstalledFont>> installedFonts(FontHive hive) const;
+  // The enumeration reports the faces of the files the installed-font lists name and bitmap-only
+  // faces, each by the full name its file's Windows name table gives in the user's language
+  // (read from the environment on every call), as the font file reader would choose it.
   // One face per family, the most regular plain face (not a named instance), sorted by family.
   std::vector<EnumeratedFace> families() const;
   // Every face, named instances included, with `faceName` among its family names (both cut to

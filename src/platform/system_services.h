@@ -76,6 +76,17 @@ uint16_t languageIdForLocale(const std::string& locale);
 // and not empty), as a Windows language identifier.
 uint16_t userLanguageIdFromEnvironment();
 
+// The Macintosh language code of a Windows language identifier: 0 (English) for identifiers
+// without an entry, 65535 for languages without a Macintosh counterpart.
+uint16_t macintoshLanguageCode(uint16_t windowsLanguageId);
+
+// Which of the languages a font name is given in (Windows language identifiers, ascending) a user
+// of `userLanguageId` reads it in, as a position in `languages`: the only one there is; else the
+// user's own; else the first with the user's Macintosh language code (related languages, and
+// languages without a Macintosh counterpart, stand in for one another); else the first English
+// one; else the first. 0 for an empty list.
+size_t preferredNameLanguage(const std::vector<uint16_t>& languages, uint16_t userLanguageId);
+
 // The GUID in its usual text form, "xxxxxxxx-xxxx-xxxx-xxxx-xxxxxxxxxxxx", lower case.
 std::string guidText(const std::array<uint8_t, 16>& guid);
 

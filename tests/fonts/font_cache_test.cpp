@@ -2,9 +2,12 @@
 // tests write) and on this machine.
 #include "fonts/font_cache.h"
 
+#include <fontconfig/fontconfig.h>
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <filesystem>
+#include <fstream>
 #include <map>
 #include <set>
 #include <string>
@@ -100,13 +103,18 @@ class FontCacheOnFakeSystem : public testing::Test {
                  const std::u16string& fullName, int32_t type = platform::kTrueTypeFontType) {
     system_->faces.push_back({family, style, fullName, type});
   }
-  // A family of faces, each in its own file in the fonts folder, installed and enumerated.
-  void addFamily(const std::u16string& family, const std::vector<std::u16string>& styles) {
+  // A family of faces, each in its own file in the fonts folder, installed and enumerated; the
+  // OS/2 fields of a style as given, else the defaults (weight 400, normal width, upright).
+  void addFamily(const std::u16string& family, const std::vector<std::u16string>& styles,
+                 const std::map<std::u16string, Os2Fields>& os2 = {}) {
     for (const std::u16string& style : styles) {
       const std::u16string postScript = family + u"-" + style;
       const std::u16string full = family + u" " + style;
       const std::string file = toUtf8(postScript) + ".ttf";
-      writeFont("fonts/" + file, family, style, full, postScript);
+      const auto fields = os2.find(style);
+      writeBytes("fonts/" + file, namedFont(family, style, full, postScript)
+                                      .setOs2(fields != os2.end() ? fields->second : Os2Fields{})
+                                      .build());
       install(FontHive::kMachine, full + u" (TrueType)", toUtf16(file));
       enumerate(family, style, full);
     }
@@ -222,7 +230,14 @@ TEST_F(FontCacheOnFakeSystem, UserFontReplacesAMachineFontOfTheSameName) {
 
 TEST_F(FontCacheOnFakeSystem, LookupsTryPostScriptThenFullNamesThenFamily) {
   addFamily(u"Fam", {u"Bold", u"Regular", u"Italic"});
-  addFamily(u"Other", {u"Bold", u"Black"});  // no regular face: the family names its first
+  addFamily(u"Other", {u"Bold", u"Black"});  // no "Regular" face, equally regular: the first
+  // No "Regular" face: the upright face of weight 400 and normal width, wherever it comes.
+  Os2Fields bold, condensed, italic;
+  bold.weightClass = 700;
+  condensed.widthClass = 3;
+  italic.fsSelection = 1;
+  addFamily(u"Serif", {u"Bold", u"Condensed", u"Italic", u"Roman"},
+            {{u"Bold", bold}, {u"Condensed", condensed}, {u"Italic", italic}});
   FontCache cache(system_);
   EXPECT_TRUE(cache.hasFont(u"", u"Other", u"nothing"));
   EXPECT_FALSE(cache.hasFont(u"nothing", u"No Such Family", u"nothing"));
@@ -236,6 +251,7 @@ TEST_F(FontCacheOnFakeSystem, LookupsTryPostScriptThenFullNamesThenFamily) {
       {u"x", u"", u"Fam Bold", u"Fam-Bold"},
       {u"x", u"Fam", u"y", u"Fam-Regular"},  // only the family matches
       {u"", u"Other", u"nothing else", u"Other-Black"},
+      {u"", u"Serif", u"nothing at all", u"Serif-Roman"},
   };
   for (const Case& c : cases) {
     EXPECT_EQ(cache.findFont(c.postScript, c.family, c.full).postScriptName, c.expected)
@@ -328,6 +344,62 @@ TEST(FontCacheOnThisMachine, EveryDejaVuFaceIsFoundByEachOfItsNames) {
     }
   }
   EXPECT_GE(faces, 6);
+}
+
+// The TrueType and OpenType files (collections included) fontconfig lists on this machine.
+std::set<std::string> listedOutlineFiles() {
+  std::set<std::string> files;
+  FcPattern* everything = FcPatternCreate();
+  FcObjectSet* objects = FcObjectSetBuild(FC_FILE, FC_FONTFORMAT, nullptr);
+  FcFontSet* listed = FcFontList(nullptr, everything, objects);
+  for (int i = 0; listed != nullptr && i < listed->nfont; ++i) {
+    FcChar8* file = nullptr;
+    FcChar8* format = nullptr;
+    if (FcPatternGetString(listed->fonts[i], FC_FILE, 0, &file) == FcResultMatch &&
+        FcPatternGetString(listed->fonts[i], FC_FONTFORMAT, 0, &format) == FcResultMatch &&
+        (std::string(reinterpret_cast<char*>(format)) == "TrueType" ||
+         std::string(reinterpret_cast<char*>(format)) == "CFF")) {
+      files.insert(reinterpret_cast<char*>(file));
+    }
+  }
+  FcFontSetDestroy(listed);
+  FcObjectSetDestroy(objects);
+  FcPatternDestroy(everything);
+  return files;
+}
+
+// Every record has a file and every listed file a record, in the user's language too: the
+// installed-font lists and the enumeration must name each face alike. Debian's URW fonts come as
+// Type 1 and OpenType files of the same names; the WenQuanYi faces have Chinese names. A file
+// whose every face repeats the PostScript name of another file's face cannot have a record of
+// its own, as records are told apart by that name.
+TEST(FontCacheOnThisMachine, EveryRecordHasAFileAndEveryListedFileARecordInEachLocale) {
+  REQUIRE_FILE("/usr/share/fonts/opentype/urw-base35/NimbusSans-Regular.otf");
+  REQUIRE_FILE("/usr/share/fonts/truetype/wqy/wqy-microhei.ttc");
+  const char* const saved = std::getenv("LC_ALL");
+  const std::set<std::string> listed = listedOutlineFiles();
+  for (const char* locale : {"C", "zh_CN.UTF-8", "zh_TW.UTF-8"}) {
+    setenv("LC_ALL", locale, 1);
+    FontCache cache(platform::createSystemServices());
+    std::set<std::string> files;
+    std::set<std::u16string> postScriptNames;
+    for (const FontRecord& record : cache.records()) {
+      EXPECT_TRUE(std::ifstream(toUtf8(record.filePath)).good())
+          << locale << ": " << toUtf8(record.postScriptName) << " has no readable file";
+      files.insert(toUtf8(record.filePath));
+      postScriptNames.insert(record.postScriptName);
+    }
+    for (const std::string& file : listed) {
+      const vesk::project::FontFileReader reader(toUtf16(file), 0x0409);
+      bool repeated = reader.faceCount() > 0;
+      for (int32_t face = 0; face < reader.faceCount(); ++face) {
+        repeated = repeated && postScriptNames.count(reader.postScriptNameUtf16(face)) > 0;
+      }
+      EXPECT_TRUE(files.count(file) > 0 || repeated) << locale << ": " << file;
+    }
+    EXPECT_FALSE(cache.findFont(u"No Such Font", u"", u"").filePath.empty()) << locale;
+  }
+  saved != nullptr ? setenv("LC_ALL", saved, 1) : unsetenv("LC_ALL");
 }
 
 }  // namespace

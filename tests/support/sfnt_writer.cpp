@@ -57,7 +57,8 @@ SfntFont& SfntFont::addNameBytes(uint16_t platformID, uint16_t encodingID, uint1
 
 SfntFont& SfntFont::setOs2(const Os2Fields& f, size_t length) {
   std::vector<uint8_t> table;
-  for (uint16_t value : {4, 500, 400, 5}) {  // version, xAvgCharWidth, weight and width class
+  // version, xAvgCharWidth, weight and width class
+  for (uint16_t value : {uint16_t{4}, uint16_t{500}, f.weightClass, f.widthClass}) {
     appendU16(table, value);
   }
   appendU16(table, f.fsType);
@@ -66,6 +67,8 @@ SfntFont& SfntFont::setOs2(const Os2Fields& f, size_t length) {
                         f.superscriptYOffset, f.strikeoutSize, f.strikeoutPosition}) {
     appendU16(table, static_cast<uint16_t>(value));
   }
+  table.resize(62, 0);  // up to fsSelection
+  appendU16(table, f.fsSelection);
   return setTable("OS/2", resized(table, length));
 }
 

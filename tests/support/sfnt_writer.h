@@ -23,6 +23,8 @@ struct Os2Fields {
   int16_t superscriptXSize = 650, superscriptYSize = 600;
   int16_t superscriptXOffset = 0, superscriptYOffset = 350;
   int16_t strikeoutSize = 50, strikeoutPosition = 300;
+  uint16_t fsSelection = 0;
+  uint16_t weightClass = 400, widthClass = 5;
 };
 
 // Axis records of 20 zero bytes; instance records of the subfamily name ID, flags and one zero

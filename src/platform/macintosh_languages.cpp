@@ -1,10 +1,14 @@
+// The Macintosh language codes of Windows language identifiers, and the choice of the language a
+// font name is read in, shared by the font file reader and the installed-font enumeration so that
+// both name a face alike.
 #include <algorithm>
 #include <cstdint>
+#include <iterator>
 #include <utility>
 
-#include "fonts/font_file_reader.h"
+#include "platform/system_services.h"
 
-namespace vesk::project {
+namespace platform {
 namespace {
 
 // Windows language identifier -> Macintosh language code, sorted by identifier. Languages that
@@ -73,4 +77,28 @@ uint16_t macintoshLanguageCode(uint16_t windowsLanguageId) {
   return entry->second;
 }
 
-}  // namespace vesk::project
+size_t preferredNameLanguage(const std::vector<uint16_t>& languages, uint16_t userLanguageId) {
+  if (languages.size() <= 1) {
+    return 0;
+  }
+  const auto at = [&](auto found) { return static_cast<size_t>(found - languages.begin()); };
+  if (const auto exact = std::find(languages.begin(), languages.end(), userLanguageId);
+      exact != languages.end()) {
+    return at(exact);
+  }
+  const uint16_t userCode = macintoshLanguageCode(userLanguageId);
+  const auto sameCode = [&](uint16_t code) {
+    return std::find_if(languages.begin(), languages.end(),
+                        [&](uint16_t language) { return macintoshLanguageCode(language) == code; });
+  };
+  if (const auto related = sameCode(userCode); related != languages.end()) {
+    return at(related);
+  }
+  constexpr uint16_t kEnglishMacintoshCode = 0;
+  if (const auto english = sameCode(kEnglishMacintoshCode); english != languages.end()) {
+    return at(english);
+  }
+  return 0;
+}
+
+}  // namespace platform
