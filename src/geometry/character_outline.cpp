@@ -4,6 +4,7 @@
 #include <cmath>
 #include <utility>
 
+#include "geometry/nonzero_union.h"
 #include "geometry/triangulate_pieces.h"
 
 namespace qvtl::geometry {
@@ -61,6 +62,25 @@ void normaliseOrientation(Shape2f& shape) {
   }
 }
 
+// Contours that cross or touch are replaced by the boundary of the area they fill together, as
+// the font fills them (non-zero winding); the containment tree alone would take an overlap for a
+// hole. Glyphs whose contours stay apart keep their own contours, split and nested as they are.
+void buildShape(CharacterOutline& outline) {
+  std::vector<const Path2f*> paths;
+  for (const OutlineContour& contour : outline.contours) {
+    paths.push_back(&contour.path);
+  }
+  if (pathsIntersect(paths) && addNonZeroUnion(outline.shape, paths, kMaxLoopsPerGlyph)) {
+    return;
+  }
+  std::size_t loops = 0;
+  for (const OutlineContour& contour : outline.contours) {
+    const std::size_t allowed = std::min(kMaxLoopsPerPath, kMaxLoopsPerGlyph - loops);
+    loops += addPath(outline.shape, contour.path, allowed);
+  }
+  normaliseOrientation(outline.shape);
+}
+
 }  // namespace
 
 std::shared_ptr<CharacterOutline> makeCharacterOutline(
@@ -91,12 +111,7 @@ std::shared_ptr<CharacterOutline> makeCharacterOutline(
     // Band geometry is built with widths (0, 0) here, which builds nothing.
     outline->contours.push_back(std::move(contour));
   }
-  std::size_t loops = 0;
-  for (const OutlineContour& contour : outline->contours) {
-    const std::size_t allowed = std::min(kMaxLoopsPerPath, kMaxLoopsPerGlyph - loops);
-    loops += addPath(outline->shape, contour.path, allowed);
-  }
-  normaliseOrientation(outline->shape);
+  buildShape(*outline);
   // Triangulated now, so that an outline shared between threads is never written while read.
   triangulatePieces(*outline);
   return outline;

@@ -88,7 +88,7 @@ class EarScorer {
     const Vec& apex = links_.points[apexPosition];
     const Vec& next = links_.points[after];
     if (!isEar(before, apexPosition, after)) {
-      return kNotAnEar;
+      return isSpike(previous, apex, next) ? kSpikeEar : kNotAnEar;
     }
     const Vec u = normalisedUnlessZero(previous - apex);
     const Vec w = normalisedUnlessZero(next - apex);
@@ -132,6 +132,13 @@ class EarScorer {
       }
     }
     return true;
+  }
+
+  // The apex is the tip of a zero-width spike: both neighbours lie on one line on the same side
+  // of it. Clipping it emits a triangle of no area and leaves the ring covering what it did.
+  static bool isSpike(const Vec& previous, const Vec& apex, const Vec& next) {
+    const Vec u = previous - apex, w = next - apex;
+    return nearZero(cross(u, w)) && u.x * w.x + u.y * w.y > 0;
   }
 
   // Closed triangle, except its corners: a vertex repeated where a hole is bridged sits on a

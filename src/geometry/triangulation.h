@@ -65,11 +65,14 @@ using TriangulationRing = std::vector<RingVertex>;
 
 inline constexpr float kNotAnEar = -4.0f;
 inline constexpr float kReflexEar = -2.0f;
+// A zero-width spike's tip: clipped only when no ear scores 0 or more, before any reflex ear.
+inline constexpr float kSpikeEar = -1.0f;
 
 // The score of the ring vertex at `position` as the apex of an ear with its ring neighbours:
 // kNotAnEar when the triangle is degenerate, its diagonal crosses a ring edge or another ring
-// vertex lies in it (edges included, points at the triangle's corners excluded); kReflexEar for a
-// reflex apex; otherwise (cos(apex angle) + 1) / 2, 1 for the sharpest apex.
+// vertex lies in it (edges included, points at the triangle's corners excluded), or kSpikeEar
+// instead when the apex is the tip of a zero-width spike; kReflexEar for a reflex apex; otherwise
+// (cos(apex angle) + 1) / 2, 1 for the sharpest apex.
 float earScore(const TriangulationGraph& graph, const TriangulationRing& ring, size_t position);
 
 // Clips the best-scored ear (the first on ties, even a negative score, so it always ends) until

@@ -95,6 +95,50 @@ TEST(CharacterOutline, DegenerateContoursGiveNoPieces) {
   EXPECT_TRUE(collectFilledPieces(makeCharacterOutline(letterO(), nanScale)->shape).empty());
 }
 
+// Contours that cross fill, as fonts fill them, every point they wind around (non-zero rule):
+// overlaps once, opposite windings cancelling, self-crossing contours on both lobes. Degenerate
+// contours and huge coordinates change nothing.
+TEST(CharacterOutline, OverlappingContoursFillTheirUnion) {
+  const PointList figureEight{{0, 0}, {4, 4}, {4, 0}, {0, 4}};  // two triangles of area 4 each
+  struct Case {
+    const char* name;
+    std::vector<PointList> contours;
+    float scale;
+    double area;  // at scale 1
+  };
+  for (const Case& c : {
+           Case{"two squares", {square(0, 0, 2, 2), square(1, 1, 3, 3)}, 1, 7},
+           Case{"two clockwise squares",
+                {reversed(square(0, 0, 2, 2)), reversed(square(1, 1, 3, 3))},
+                1,
+                7},
+           // The square covers 1 of each lobe: it adds to the counter-clockwise left lobe and
+           // cancels the clockwise right one.
+           Case{"figure-eight and square", {figureEight, square(1, 1, 3, 3)}, 1, 9},
+           Case{"opposite windings", {square(0, 0, 4, 4), reversed(square(1, -1, 3, 5))}, 1, 12},
+           Case{"degenerate contours, huge coordinates",
+                {{}, square(0, 0, 2, 2), {{0, 1}, {3, 1}, {1, 1}}, square(1, 1, 3, 3)},
+                1e30f,
+                7},
+       }) {
+    GlyphDescriptor glyph;
+    for (const PointList& contour : c.contours) {
+      glyph.contours.push_back(polygon(contour));
+    }
+    GlyphOutlineRequest request;
+    request.scale = c.scale;
+    const auto outline = makeCharacterOutline(glyph, request);
+    const double expected = c.area * c.scale * c.scale;
+    EXPECT_NEAR(waveform_test::trianglesArea(outline->vertices, outline->indices), expected,
+                1e-5 * expected)
+        << c.name;
+    EXPECT_EQ(outline->contours.size(), c.contours.size()) << c.name;
+    for (const uint32_t id : outline->pieceIds) {
+      EXPECT_TRUE(id >= 1 && id <= c.contours.size()) << c.name << ": piece id " << id;
+    }
+  }
+}
+
 TEST(CharacterOutline, LoopsPerGlyphAreCapped) {
   GlyphDescriptor glyph;
   for (int k = 0; k < 1500; ++k) {

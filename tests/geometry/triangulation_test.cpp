@@ -192,6 +192,22 @@ TEST(TriangulatePolygon, CoversTheFilledAreaOnce) {
        {{0, 0}, {10, 0}, {10, 10}, {6, 10}, {6, 4}, {4, 4}, {4, 10}, {0, 10}},
        {reversed(square(1, 1, 3, 8))}},
       {"octagon with octagon hole", regularPolygon(8, 10), {reversed(regularPolygon(8, 6))}},
+      // A letter A made of an inverted V and an overlapping bar, after their union: the hole's
+      // lower right corner lies on the line of the notch's right edge, which leaves a zero-width
+      // spike in the ring once the triangles beside it are clipped.
+      {"hole corner in line with an outer edge",
+       {{8.87722301f, 10},
+        {23.2003765f, 10},
+        {26.640625f, 0},
+        {31.078125f, 0},
+        {18.078125f, 36},
+        {14.171875f, 36},
+        {0.9375f, 0},
+        {5.359375f, 0}},
+       {{{10.1689329f, 13.671875f},
+         {15.984375f, 30.203125f},
+         {16.25f, 30.203125f},
+         {21.9371605f, 13.671875f}}}},
       {"comb", comb(7), {}},
       {"comb of one tooth", comb(1), {}},
       {"spiral", spiral(3, 24), {}},
