@@ -2,11 +2,15 @@
 // of each font at 48 pixels, the wrongly covered area over FreeType's inked area (see
 // tests/support/glyph_coverage.h). Prints per font the mean, the worst glyph and how many glyphs
 // pass a limit, and with --list every glyph past it.
-//   glyph_coverage_bench [--list] [--limit=0.1] [FONT_FILE...]   (default: the fonts setup.sh
-//   installs)
+//   glyph_coverage_bench [--list] [--limit=0.1] [FONT_FILE...]   (default: every TrueType and
+//   OpenType face fontconfig lists)
+#include <fontconfig/fontconfig.h>
+
 #include <cstdio>
 #include <cstdlib>
+#include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "freetype_face.h"
@@ -14,33 +18,50 @@
 
 namespace {
 
-const char* const kDefaultFonts[] = {
-    "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf",
-    "/usr/share/fonts/truetype/dejavu/DejaVuSans-Bold.ttf",
-    "/usr/share/fonts/truetype/dejavu/DejaVuSansMono.ttf",
-    "/usr/share/fonts/truetype/dejavu/DejaVuSansMono-Bold.ttf",
-    "/usr/share/fonts/truetype/dejavu/DejaVuSerif.ttf",
-    "/usr/share/fonts/truetype/dejavu/DejaVuSerif-Bold.ttf",
-    "/usr/share/fonts/opentype/cantarell/Cantarell-Thin.otf",
-    "/usr/share/fonts/opentype/cantarell/Cantarell-Light.otf",
-    "/usr/share/fonts/opentype/cantarell/Cantarell-Regular.otf",
-    "/usr/share/fonts/opentype/cantarell/Cantarell-Bold.otf",
-    "/usr/share/fonts/opentype/cantarell/Cantarell-ExtraBold.otf",
-    "/usr/share/fonts/truetype/inter-vf/Inter.var.ttf",
-    "/usr/share/fonts/truetype/inter-vf/Inter-roman.var.ttf",
-    "/usr/share/fonts/truetype/inter-vf/Inter-italic.var.ttf",
-    "/usr/share/fonts/truetype/inter-vf/InterDisplay.var.ttf",
-    "/usr/share/fonts/truetype/inter-vf/InterDisplay-roman.var.ttf",
-    "/usr/share/fonts/truetype/inter-vf/InterDisplay-italic.var.ttf",
-    "/usr/share/fonts/truetype/wqy/wqy-microhei.ttc",
+struct FontFace {
+  std::string path;
+  int index = 0;
 };
+
+// Every TrueType and OpenType face fontconfig lists (named instances of variable fonts are
+// measured at their default instance, once per face).
+std::vector<FontFace> installedFaces() {
+  std::set<std::pair<std::string, int>> seen;
+  FcPattern* pattern = FcPatternCreate();
+  FcObjectSet* objects = FcObjectSetBuild(FC_FILE, FC_INDEX, FC_FONTFORMAT, nullptr);
+  FcFontSet* set = FcFontList(nullptr, pattern, objects);
+  for (int i = 0; set != nullptr && i < set->nfont; ++i) {
+    FcChar8* file = nullptr;
+    FcChar8* format = nullptr;
+    int index = 0;
+    if (FcPatternGetString(set->fonts[i], FC_FILE, 0, &file) != FcResultMatch ||
+        FcPatternGetString(set->fonts[i], FC_FONTFORMAT, 0, &format) != FcResultMatch) {
+      continue;
+    }
+    const std::string kind = reinterpret_cast<const char*>(format);
+    FcPatternGetInteger(set->fonts[i], FC_INDEX, 0, &index);
+    if (kind == "TrueType" || kind == "CFF") {
+      seen.emplace(reinterpret_cast<const char*>(file), index & 0xFFFF);
+    }
+  }
+  if (set != nullptr) {
+    FcFontSetDestroy(set);
+  }
+  FcObjectSetDestroy(objects);
+  FcPatternDestroy(pattern);
+  std::vector<FontFace> faces;
+  for (const auto& [path, index] : seen) {
+    faces.push_back({path, index});
+  }
+  return faces;
+}
 
 }  // namespace
 
 int main(int argc, char** argv) {
   bool list = false;
   double limit = 0.1;
-  std::vector<std::string> fonts;
+  std::vector<FontFace> fonts;
   for (int i = 1; i < argc; ++i) {
     const std::string argument = argv[i];
     if (argument == "--list") {
@@ -48,15 +69,15 @@ int main(int argc, char** argv) {
     } else if (argument.rfind("--limit=", 0) == 0) {
       limit = std::atof(argument.c_str() + 8);
     } else {
-      fonts.push_back(argument);
+      fonts.push_back({argument, 0});
     }
   }
   if (fonts.empty()) {
-    fonts.assign(std::begin(kDefaultFonts), std::end(kDefaultFonts));
+    fonts = installedFaces();
   }
   int status = 0;
-  for (const std::string& path : fonts) {
-    const waveform_test::FreeTypeFace face(path, 0, 48);
+  for (const auto& [path, index] : fonts) {
+    const waveform_test::FreeTypeFace face(path, index, 48);
     if (face.get() == nullptr) {
       std::fprintf(stderr, "glyph_coverage_bench: cannot open %s\n", path.c_str());
       status = 1;
@@ -83,8 +104,8 @@ int main(int argc, char** argv) {
         }
       }
     }
-    std::printf("%s: %ld inked glyphs, mean %.2f %%, worst %.1f %% (glyph %ld), %ld over %.0f %%\n",
-                path.c_str(), inked, inked > 0 ? 100 * sum / inked : 0.0, 100 * worst, worstGlyph,
+    std::printf("%s#%d: %ld inked glyphs, mean %.2f %%, worst %.1f %% (glyph %ld), %ld over %.0f %%\n",
+                path.c_str(), index, inked, inked > 0 ? 100 * sum / inked : 0.0, 100 * worst, worstGlyph,
                 over, 100 * limit);
   }
   return status;

@@ -101,6 +101,23 @@ class HoleBridger {
  public:
   explicit HoleBridger(const std::vector<TriangulationVertex>& vertices) : vertices_(vertices) {}
 
+  // A hole that touches the ring at a point (one of its vertices lies where a ring vertex lies)
+  // needs no bridge: it is spliced in at that point. Gives the hole's vertex and the ring
+  // position, whose filled wedge holds the hole's edges there.
+  std::optional<std::pair<size_t, size_t>> touchingPoint(const Ring& ring, const Ring& hole) const {
+    for (size_t k = 0; k < hole.size(); ++k) {
+      const Vec p = point(hole[k]);
+      const bool onRing = std::any_of(ring.begin(), ring.end(), [&](uint32_t vertex) {
+        const Vec q = point(vertex);
+        return q.x == p.x && q.y == p.y;
+      });
+      if (onRing) {
+        return std::pair{k, positionFacing(ring, p, point(hole[(k + 1) % hole.size()]))};
+      }
+    }
+    return std::nullopt;
+  }
+
   // The ring position whose vertex the hole point m sees, or nothing when no ring edge lies to its
   // right (the hole is not inside the ring).
   std::optional<size_t> visiblePosition(const Ring& ring, uint32_t m) const {
@@ -199,15 +216,30 @@ void addRingEdges(TriangulationGraph& graph, const Ring& ring) {
   }
 }
 
-// Splices each hole into `ring` behind the vertex it sees: ..., v, m, hole..., m, v, ...
-void bridgeHoles(TriangulationGraph& graph, Ring& ring, std::vector<Ring> holes) {
+// Splices each hole into `ring` behind the vertex it sees: ..., v, m, hole..., m, v, ... A hole
+// that touches the ring is spliced in where it touches. True when a hole touched the ring.
+bool bridgeHoles(TriangulationGraph& graph, Ring& ring, std::vector<Ring> holes) {
   const auto& vertices = graph.vertices();
   std::stable_sort(holes.begin(), holes.end(), [&vertices](const Ring& a, const Ring& b) {
     return vertices[a[rightmost(vertices, a)]].position.x >
            vertices[b[rightmost(vertices, b)]].position.x;
   });
   const HoleBridger bridger(vertices);
+  bool touched = false;
   for (const Ring& hole : holes) {
+    if (const auto touching = bridger.touchingPoint(ring, hole)) {
+      touched = true;
+      // ..., p, hole after p ..., p (the hole's own vertex), ...: the ring touches itself at p.
+      const auto [k, at] = *touching;
+      Ring spliced(ring.begin(), ring.begin() + static_cast<std::ptrdiff_t>(at) + 1);
+      for (size_t step = 1; step <= hole.size(); ++step) {
+        spliced.push_back(hole[(k + step) % hole.size()]);
+      }
+      spliced.insert(spliced.end(), ring.begin() + static_cast<std::ptrdiff_t>(at) + 1, ring.end());
+      addRingEdges(graph, hole);
+      ring = std::move(spliced);
+      continue;
+    }
     const size_t m = rightmost(vertices, hole);
     const std::optional<size_t> at = bridger.visiblePosition(ring, hole[m]);
     if (!at) {
@@ -223,6 +255,42 @@ void bridgeHoles(TriangulationGraph& graph, Ring& ring, std::vector<Ring> holes)
     graph.addEdge(ring[*at], hole[m]);
     ring = std::move(spliced);
   }
+  return touched;
+}
+
+// A hole that touches its outer ring at two points cuts the piece there, and other holes may add
+// further cuts: the ring then touches itself at points where both of its parts fill area. Such
+// a ring is clipped as the separate rings it splits into at those points; a repeated point with
+// a hole on one side (a bridge end, a single touch) keeps the ring whole.
+std::vector<Ring> separatedAtCuts(const std::vector<TriangulationVertex>& vertices, Ring ring) {
+  std::vector<Ring> done;
+  std::vector<Ring> pending = {std::move(ring)};
+  while (!pending.empty()) {
+    Ring current = std::move(pending.back());
+    pending.pop_back();
+    bool split = false;
+    for (size_t i = 0; i < current.size() && !split; ++i) {
+      for (size_t j = i + 2; j < current.size() && !split; ++j) {
+        if (vertices[current[i]].position != vertices[current[j]].position ||
+            (i == 0 && j + 1 == current.size())) {
+          continue;
+        }
+        Ring inner(current.begin() + static_cast<std::ptrdiff_t>(i),
+                   current.begin() + static_cast<std::ptrdiff_t>(j));
+        Ring outer(current.begin() + static_cast<std::ptrdiff_t>(j), current.end());
+        outer.insert(outer.end(), current.begin(), current.begin() + static_cast<std::ptrdiff_t>(i));
+        if (signedArea(vertices, inner) > 0 && signedArea(vertices, outer) > 0) {
+          pending.push_back(std::move(inner));
+          pending.push_back(std::move(outer));
+          split = true;
+        }
+      }
+    }
+    if (!split) {
+      done.push_back(std::move(current));
+    }
+  }
+  return done;
 }
 
 }  // namespace
@@ -260,15 +328,19 @@ TriangulationResult triangulatePolygon(const PointList& outer, const std::vector
     }
     first += static_cast<uint32_t>(hole.size());
   }
-  bridgeHoles(graph, ring, std::move(holeRings));
+  const bool touched = bridgeHoles(graph, ring, std::move(holeRings));
 
   TriangulationResult result;
-  TriangulationRing clipped;
-  clipped.reserve(ring.size());
-  for (uint32_t vertex : ring) {
-    clipped.push_back({vertex, 0.0f});
+  const std::vector<Ring> rings =
+      touched ? separatedAtCuts(graph.vertices(), std::move(ring)) : std::vector<Ring>{ring};
+  for (const Ring& part : rings) {
+    TriangulationRing clipped;
+    clipped.reserve(part.size());
+    for (uint32_t vertex : part) {
+      clipped.push_back({vertex, 0.0f});
+    }
+    clipEars(graph, clipped, maxIterations, result.triangles);
   }
-  clipEars(graph, clipped, maxIterations, result.triangles);
   result.vertices.reserve(graph.vertices().size());
   for (const TriangulationVertex& vertex : graph.vertices()) {
     result.vertices.push_back(vertex.position);

@@ -208,6 +208,14 @@ TEST(TriangulatePolygon, CoversTheFilledAreaOnce) {
          {15.984375f, 30.203125f},
          {16.25f, 30.203125f},
          {21.9371605f, 13.671875f}}}},
+      // The non-zero union of overlapping contours leaves holes that touch their outer ring or
+      // each other at a point, as in a star with an open centre.
+      {"hole touching the outer at two corners, cutting it in two",
+       {{0, 0}, {10, 0}, {10, 5}, {10, 10}, {0, 10}, {0, 5}},
+       {{{0, 5}, {5, 7}, {10, 5}, {5, 3}}}},
+      {"holes touching at a point",
+       ten,
+       {{{2, 2}, {2, 8}, {5, 5}}, {{8, 8}, {8, 2}, {5, 5}}, {{3.5f, 9}, {6.5f, 9}, {5, 5}}}},
       {"comb", comb(7), {}},
       {"comb of one tooth", comb(1), {}},
       {"spiral", spiral(3, 24), {}},
