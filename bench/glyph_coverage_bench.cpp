@@ -104,9 +104,10 @@ int main(int argc, char** argv) {
         }
       }
     }
-    std::printf("%s#%d: %ld inked glyphs, mean %.2f %%, worst %.1f %% (glyph %ld), %ld over %.0f %%\n",
-                path.c_str(), index, inked, inked > 0 ? 100 * sum / inked : 0.0, 100 * worst, worstGlyph,
-                over, 100 * limit);
+    std::printf(
+        "%s#%d: %ld inked glyphs, mean %.2f %%, worst %.1f %% (glyph %ld), %ld over %.0f %%\n",
+        path.c_str(), index, inked, inked > 0 ? 100 * sum / inked : 0.0, 100 * worst, worstGlyph,
+        over, 100 * limit);
   }
   return status;
 }

@@ -62,15 +62,16 @@ void normaliseOrientation(Shape2f& shape) {
   }
 }
 
-// Contours that cross or touch are replaced by the boundary of the area they fill together, as
-// the font fills them (non-zero winding); the containment tree alone would take an overlap for a
-// hole. Glyphs whose contours stay apart keep their own contours, split and nested as they are.
+// Contours that cross or touch, or that nest inside a contour winding their way, are replaced by
+// the boundary of the area they fill together, as the font fills them (non-zero winding); the
+// containment tree alone would take an overlap, or a contour inside a like one, for a hole. Glyphs whose contours stay apart keep their own contours, split and nested as they are.
 void buildShape(CharacterOutline& outline) {
   std::vector<const Path2f*> paths;
   for (const OutlineContour& contour : outline.contours) {
     paths.push_back(&contour.path);
   }
-  if (pathsIntersect(paths) && addNonZeroUnion(outline.shape, paths, kMaxLoopsPerGlyph)) {
+  if ((pathsIntersect(paths) || nestedWithTheirParentsWinding(paths)) &&
+      addNonZeroUnion(outline.shape, paths, kMaxLoopsPerGlyph)) {
     return;
   }
   std::size_t loops = 0;

@@ -63,6 +63,28 @@ std::vector<Segment> collectSegments(const std::vector<const Path2f*>& paths) {
   return segments;
 }
 
+double signedArea(const PointList& points) {
+  double sum = 0;
+  for (size_t i = 0; i < points.size(); ++i) {
+    const Point2f a = points[i], b = points[(i + 1) % points.size()];
+    sum += double(a.x) * b.y - double(b.x) * a.y;
+  }
+  return sum * 0.5;
+}
+
+// Even-odd crossing test of a point against a closed polygon.
+bool inside(const PointList& polygon, Point2f p) {
+  bool in = false;
+  for (size_t i = 0, j = polygon.size() - 1; i < polygon.size(); j = i++) {
+    const Point2f a = polygon[i], b = polygon[j];
+    if ((a.y > p.y) != (b.y > p.y) &&
+        p.x < (double(b.x) - a.x) * (double(p.y) - a.y) / (double(b.y) - a.y) + a.x) {
+      in = !in;
+    }
+  }
+  return in;
+}
+
 uint64_t pointKey(const ClipperLib::IntPoint& p) {
   return (static_cast<uint64_t>(static_cast<uint32_t>(p.X)) << 32) | static_cast<uint32_t>(p.Y);
 }
@@ -174,6 +196,41 @@ bool pathsIntersect(const std::vector<const Path2f*>& paths) {
       if (budget-- == 0 || segmentsMeet(s, t)) {
         return true;
       }
+    }
+  }
+  return false;
+}
+
+bool nestedWithTheirParentsWinding(const std::vector<const Path2f*>& paths) {
+  struct Contour {
+    const PointList* points;
+    bool counterClockwise;
+    std::vector<size_t> containers;  // the contours it lies inside
+  };
+  std::vector<Contour> contours;
+  for (const Path2f* path : paths) {
+    const double area = path->points.size() >= 3 ? signedArea(path->points) : 0.0;
+    if (area != 0 && std::isfinite(area)) {
+      contours.push_back({&path->points, area > 0, {}});
+    }
+  }
+  for (size_t i = 0; i < contours.size(); ++i) {
+    for (size_t j = 0; j < contours.size(); ++j) {
+      if (i != j && inside(*contours[j].points, contours[i].points->front())) {
+        contours[i].containers.push_back(j);
+      }
+    }
+  }
+  for (const Contour& contour : contours) {
+    // The nearest container is the one inside the most others.
+    const Contour* parent = nullptr;
+    for (const size_t j : contour.containers) {
+      if (parent == nullptr || contours[j].containers.size() > parent->containers.size()) {
+        parent = &contours[j];
+      }
+    }
+    if (parent != nullptr && parent->counterClockwise == contour.counterClockwise) {
+      return true;
     }
   }
   return false;

@@ -19,6 +19,12 @@ constexpr std::size_t kMaxIntersectionTests = 4'000'000;
 // other in one path excepted. Paths of fewer than 3 points take no part.
 bool pathsIntersect(const std::vector<const Path2f*>& paths);
 
+// Whether some path lies inside another that winds the same way as it, with no path between
+// them (a counter inside a counter, a letter inside a ring's hole drawn like the hole): the
+// non-zero rule fills what a containment tree, alternating filled and empty by depth, would
+// leave empty. Meant for paths that do not intersect; paths without area take no part.
+bool nestedWithTheirParentsWinding(const std::vector<const Path2f*>& paths);
+
 // Adds to `shape` (an empty root) the boundary of the area the paths fill under the non-zero
 // rule: its outer loops counter-clockwise as the root's children, the holes in each clockwise
 // as its children, islands in holes below them, and so on. Each loop carries the id of the path

@@ -278,7 +278,8 @@ std::vector<Ring> separatedAtCuts(const std::vector<TriangulationVertex>& vertic
         Ring inner(current.begin() + static_cast<std::ptrdiff_t>(i),
                    current.begin() + static_cast<std::ptrdiff_t>(j));
         Ring outer(current.begin() + static_cast<std::ptrdiff_t>(j), current.end());
-        outer.insert(outer.end(), current.begin(), current.begin() + static_cast<std::ptrdiff_t>(i));
+        outer.insert(outer.end(), current.begin(),
+                     current.begin() + static_cast<std::ptrdiff_t>(i));
         if (signedArea(vertices, inner) > 0 && signedArea(vertices, outer) > 0) {
           pending.push_back(std::move(inner));
           pending.push_back(std::move(outer));

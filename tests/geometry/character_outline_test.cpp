@@ -95,9 +95,9 @@ TEST(CharacterOutline, DegenerateContoursGiveNoPieces) {
   EXPECT_TRUE(collectFilledPieces(makeCharacterOutline(letterO(), nanScale)->shape).empty());
 }
 
-// Contours that cross fill, as fonts fill them, every point they wind around (non-zero rule):
-// overlaps once, opposite windings cancelling, self-crossing contours on both lobes. Degenerate
-// contours and huge coordinates change nothing.
+// Contours that cross or nest fill, as fonts fill them, every point they wind around (non-zero
+// rule): overlaps once, opposite windings cancelling, self-crossing contours on both lobes.
+// Degenerate contours and huge coordinates change nothing.
 TEST(CharacterOutline, OverlappingContoursFillTheirUnion) {
   const PointList figureEight{{0, 0}, {4, 4}, {4, 0}, {0, 4}};  // two triangles of area 4 each
   struct Case {
@@ -116,6 +116,13 @@ TEST(CharacterOutline, OverlappingContoursFillTheirUnion) {
            // cancels the clockwise right one.
            Case{"figure-eight and square", {figureEight, square(1, 1, 3, 3)}, 1, 9},
            Case{"opposite windings", {square(0, 0, 4, 4), reversed(square(1, -1, 3, 5))}, 1, 12},
+           // Contours apart from each other: a letter inside a ring's hole, drawn the way the hole
+           // winds, is filled (16 - 4 + 1).
+           Case{"island winding like its hole",
+                {square(0, 0, 4, 4), reversed(square(1, 1, 3, 3)),
+                 reversed(square(1.5f, 1.5f, 2.5f, 2.5f))},
+                1,
+                13},
            Case{"degenerate contours, huge coordinates",
                 {{}, square(0, 0, 2, 2), {{0, 1}, {3, 1}, {1, 1}}, square(1, 1, 3, 3)},
                 1e30f,
