@@ -29,7 +29,8 @@ std::vector<FontFace> installedFaces() {
   std::set<std::pair<std::string, int>> seen;
   FcPattern* pattern = FcPatternCreate();
   FcObjectSet* objects = FcObjectSetBuild(FC_FILE, FC_INDEX, FC_FONTFORMAT, nullptr);
-  FcFontSet* set = FcFontList(nullptr, pattern, objects);
+  FcConfig* config = FcInitLoadConfigAndFonts();
+  FcFontSet* set = FcFontList(config, pattern, objects);
   for (int i = 0; set != nullptr && i < set->nfont; ++i) {
     FcChar8* file = nullptr;
     FcChar8* format = nullptr;
@@ -49,6 +50,7 @@ std::vector<FontFace> installedFaces() {
   }
   FcObjectSetDestroy(objects);
   FcPatternDestroy(pattern);
+  FcConfigDestroy(config);
   std::vector<FontFace> faces;
   for (const auto& [path, index] : seen) {
     faces.push_back({path, index});

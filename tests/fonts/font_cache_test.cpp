@@ -351,7 +351,9 @@ std::set<std::string> listedOutlineFiles() {
   std::set<std::string> files;
   FcPattern* everything = FcPatternCreate();
   FcObjectSet* objects = FcObjectSetBuild(FC_FILE, FC_FONTFORMAT, nullptr);
-  FcFontSet* listed = FcFontList(nullptr, everything, objects);
+  // A configuration of its own, destroyed afterwards, as the catalogue loads one.
+  FcConfig* config = FcInitLoadConfigAndFonts();
+  FcFontSet* listed = FcFontList(config, everything, objects);
   for (int i = 0; listed != nullptr && i < listed->nfont; ++i) {
     FcChar8* file = nullptr;
     FcChar8* format = nullptr;
@@ -365,6 +367,7 @@ std::set<std::string> listedOutlineFiles() {
   FcFontSetDestroy(listed);
   FcObjectSetDestroy(objects);
   FcPatternDestroy(everything);
+  FcConfigDestroy(config);
   return files;
 }
 
