@@ -245,7 +245,8 @@ bool addNonZeroUnion(Shape2f& shape, const std::vector<const Path2f*>& paths,
   ClipperLib::PolyTree tree;
   try {
     ClipperLib::Clipper clipper;
-    // Strictly simple loops touch neither themselves nor each other, as the triangulator needs.
+    // Strictly simple loops never touch themselves; a hole may still meet its outer loop or
+    // another hole at a point, which the triangulator splices in there.
     clipper.StrictlySimple(true);
     clipper.AddPaths(source.paths, ClipperLib::ptSubject, true);
     if (!clipper.Execute(ClipperLib::ctUnion, tree, ClipperLib::pftNonZero,
