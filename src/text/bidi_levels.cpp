@@ -2,28 +2,10 @@
 
 #include <algorithm>
 
-#include "text/bidi_paragraph.h"
-
 namespace vesk::plugin::lib {
 namespace {
 
 using vesk::project::TextToken;
-
-class UnicodeBrackets : public BracketSource {
- public:
-  explicit UnicodeBrackets(UnicodeHelper& data) : data_(data) {}
-  BracketRecord bracket(uint32_t codePoint) override {
-    const auto found = data_.brackets().find(codePoint);
-    return found == data_.brackets().end() ? BracketRecord{} : found->second;
-  }
-  uint32_t canonical(uint32_t codePoint) override {
-    const uint32_t single = data_.decomposition(codePoint);
-    return single != 0 ? single : codePoint;
-  }
-
- private:
-  UnicodeHelper& data_;
-};
 
 // The character tokens of one paragraph, resolved together.
 struct Paragraph {
@@ -33,7 +15,7 @@ struct Paragraph {
   std::vector<uint32_t> codePoints;
 };
 
-void resolveParagraph(Paragraph& paragraph, int32_t direction, UnicodeBrackets& brackets,
+void resolveParagraph(Paragraph& paragraph, int32_t direction, UnicodeBracketSource& brackets,
                       std::vector<BidiEntry>& result) {
   const size_t count = paragraph.classes.size();
   std::vector<BidiClass> resolved(count);
@@ -58,6 +40,16 @@ void resolveParagraph(Paragraph& paragraph, int32_t direction, UnicodeBrackets& 
 
 }  // namespace
 
+BracketRecord UnicodeBracketSource::bracket(uint32_t codePoint) {
+  const auto found = data_.brackets().find(codePoint);
+  return found == data_.brackets().end() ? BracketRecord{} : found->second;
+}
+
+uint32_t UnicodeBracketSource::canonical(uint32_t codePoint) {
+  const uint32_t single = data_.decomposition(codePoint);
+  return single != 0 ? single : codePoint;
+}
+
 void resolveLevels(UnicodeHelper& unicodeData, std::vector<BidiEntry>& result,
                    const std::shared_ptr<TextToken>& firstToken, int32_t direction) {
   result.clear();
@@ -68,7 +60,7 @@ void resolveLevels(UnicodeHelper& unicodeData, std::vector<BidiEntry>& result,
   }
   unicodeData.ensureLoaded(highest);
 
-  UnicodeBrackets brackets(unicodeData);
+  UnicodeBracketSource brackets(unicodeData);
   Paragraph paragraph;
   for (std::shared_ptr<TextToken> token = firstToken; token; token = token->next) {
     if (token->kind == TextToken::kParagraph) {

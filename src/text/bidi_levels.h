@@ -7,6 +7,7 @@
 #include <memory>
 #include <vector>
 
+#include "text/bidi_paragraph.h"
 #include "text/text_token.h"
 #include "text/unicode_helper.h"
 
@@ -17,6 +18,17 @@ struct BidiEntry {
   std::shared_ptr<vesk::project::TextToken> token;
   uint32_t bidiClass = 0;  // a BidiClass value; the paragraph's own direction in a paragraph entry
   int16_t level = 0;
+};
+
+// Bracket records and singleton canonical equivalents from the Unicode data.
+class UnicodeBracketSource : public BracketSource {
+ public:
+  explicit UnicodeBracketSource(UnicodeHelper& data) : data_(data) {}
+  BracketRecord bracket(uint32_t codePoint) override;
+  uint32_t canonical(uint32_t codePoint) override;
+
+ private:
+  UnicodeHelper& data_;
 };
 
 // Fills `result` with every paragraph token and every character token that rule X9 keeps

@@ -12,12 +12,15 @@
 #include <vector>
 
 #include "ci_or_skip.h"
+#include "text/bidi_line.h"
 #include "text/bidi_paragraph.h"
 
 namespace waveform_test {
 namespace {
 
 using vesk::plugin::lib::BidiClass;
+using vesk::plugin::lib::resetLineEndLevels;
+using vesk::plugin::lib::visualOrder;
 using Levels = std::vector<int16_t>;
 
 constexpr int16_t kX = vesk::plugin::lib::kRemovedBidiLevel;
@@ -60,57 +63,6 @@ std::vector<int> numbersFrom(const std::string& text) {
     numbers.push_back(std::stoi(word));
   }
   return numbers;
-}
-
-// The rest of rule L1, for one line: white space and isolate formatting characters before a
-// segment or paragraph separator or at the end of the line take the paragraph level.
-void applyLineEnd(const std::vector<BidiClass>& classes, Levels& levels, int paragraphLevel) {
-  bool trailing = true;
-  for (size_t i = classes.size(); i-- > 0;) {
-    const BidiClass c = classes[i];
-    if (levels[i] == kX) {
-      continue;
-    }
-    if (c == BidiClass::S || c == BidiClass::B) {
-      levels[i] = static_cast<int16_t>(paragraphLevel);
-      trailing = true;
-    } else if (trailing && (c == BidiClass::WS || c == BidiClass::LRI || c == BidiClass::RLI ||
-                            c == BidiClass::FSI || c == BidiClass::PDI)) {
-      levels[i] = static_cast<int16_t>(paragraphLevel);
-    } else {
-      trailing = false;
-    }
-  }
-}
-
-// L2: from the highest level down to the lowest odd one, every run at that level or above is
-// reversed. Removed characters are left out.
-std::vector<int> visualOrder(const Levels& levels) {
-  std::vector<int> order;
-  int16_t highest = 0;
-  int16_t lowestOdd = 127;
-  for (size_t i = 0; i < levels.size(); ++i) {
-    if (levels[i] != kX) {
-      order.push_back(static_cast<int>(i));
-      highest = std::max(highest, levels[i]);
-      lowestOdd = levels[i] % 2 == 1 ? std::min(lowestOdd, levels[i]) : lowestOdd;
-    }
-  }
-  for (int16_t level = highest; level >= lowestOdd; --level) {
-    for (size_t i = 0; i < order.size();) {
-      if (levels[order[i]] < level) {
-        ++i;
-        continue;
-      }
-      size_t end = i;
-      while (end < order.size() && levels[order[end]] >= level) {
-        ++end;
-      }
-      std::reverse(order.begin() + i, order.begin() + end);
-      i = end;
-    }
-  }
-  return order;
 }
 
 std::string joined(const std::vector<int>& values) {
@@ -160,7 +112,7 @@ bool checkCase(const std::vector<BidiClass>& classes, const std::vector<uint32_t
   const int level = vesk::plugin::lib::resolveBidiClasses(
       classes.data(), codePoints.empty() ? nullptr : codePoints.data(), classes.size(), direction,
       brackets, resolved.data(), levels.data());
-  applyLineEnd(classes, levels, level);
+  resetLineEndLevels(classes, levels, level);
   const std::string where = input + " (direction " + std::to_string(direction) + ")";
   if (paragraphLevel >= 0 && level != paragraphLevel) {
     tally.fail("paragraph level", where + ": expected " + std::to_string(paragraphLevel) +
