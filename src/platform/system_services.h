@@ -68,6 +68,10 @@ class SystemServices {
 // This machine's services; created on first use and shared.
 std::shared_ptr<const SystemServices> systemServices();
 
+// Whether the character is white space in the platform's wide-character classification; what
+// SystemServices::isWideSpace answers on this platform, without making the services.
+bool isWideSpace(char32_t character);
+
 // A locale name as the environment gives it ("de_AT.UTF-8", "fr", "zh_HK@variant") as a Windows
 // language identifier; 0x0409 (English, United States) when it is unknown, empty, "C" or "POSIX".
 uint16_t languageIdForLocale(const std::string& locale);

@@ -80,11 +80,21 @@ class UnicodeHelper {
   size_t skippedLines() const { return skippedLines_; }
 
  private:
+  void readBracketFile();
+  void readCharacterFile(uint32_t limit);
+  // The record of a code point once its block is loaded; null when the data give none.
+  const CharacterRecord* record(uint32_t codePoint);
+
   std::filesystem::path dataFolder_;
   bool characterFileOpened_ = false;
   bool bracketFileOpened_ = false;
   uint32_t loadedUpTo_ = 0;
+  // Whether a load has happened: loadedUpTo_ 0 alone cannot tell, and U+0000 has data too.
+  bool loadedAny_ = false;
   size_t skippedLines_ = 0;
+  // Where the next load goes on reading the character file: the start of the first line that
+  // lay beyond the last load's block (the file's end once it has been read through).
+  uint64_t characterFileResume_ = 0;
   std::map<uint32_t, CharacterRecord> characters_;
   std::map<uint32_t, BracketRecord> brackets_;
   std::map<uint32_t, SpecialCasingRecord> specialCasing_;
