@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "ci_or_skip.h"
+#include "text/bidi_levels.h"
 #include "text/bidi_line.h"
 #include "text/bidi_paragraph.h"
 
@@ -24,7 +25,7 @@ using vesk::plugin::lib::visualOrder;
 using Levels = std::vector<int16_t>;
 
 constexpr int16_t kX = vesk::plugin::lib::kRemovedBidiLevel;
-const std::string kUnicodeFolder = "/usr/share/unicode/";
+const std::string kUnicodeFolder = WAVEFORM_UNICODE_DIR "/";
 
 BidiClass classNamed(const std::string& name) {
   static const std::map<std::string, BidiClass> classes = [] {
@@ -166,6 +167,41 @@ TEST(BidiConformance, EveryLineOfBidiTestPasses) {
   std::cout << tally.report("BidiTest.txt") << "\n";
   EXPECT_GT(tally.cases, 0u);
   EXPECT_EQ(tally.failed(), 0u) << tally.report("BidiTest.txt");
+}
+
+TEST(BidiConformance, EveryLineOfBidiCharacterTestPasses) {
+  const std::string path = kUnicodeFolder + "BidiCharacterTest.txt";
+  REQUIRE_FILE(path);
+  REQUIRE_FILE(kUnicodeFolder + "UnicodeData.txt");
+  vesk::plugin::lib::UnicodeHelper unicodeData(kUnicodeFolder);
+  vesk::plugin::lib::UnicodeBracketSource brackets(unicodeData);
+  std::ifstream file(path);
+  Tally tally;
+  const int32_t directions[] = {1, -1, 0};  // field 1: 0 left-to-right, 1 right-to-left, 2 auto
+  for (std::string line; std::getline(file, line);) {
+    std::vector<std::string> fields;
+    std::istringstream stream(line.substr(0, line.find('#')));
+    for (std::string field; std::getline(stream, field, ';');) {
+      fields.push_back(field);
+    }
+    if (fields.size() < 5) {
+      continue;
+    }
+    ++tally.lines;
+    ++tally.cases;
+    std::vector<uint32_t> codePoints;
+    std::vector<BidiClass> classes;
+    for (const std::string& word : words(fields[0])) {
+      codePoints.push_back(static_cast<uint32_t>(std::stoul(word, nullptr, 16)));
+      classes.push_back(unicodeData.bidiClass(codePoints.back()));
+    }
+    tally.passed += checkCase(classes, codePoints, directions[std::stoi(fields[1])], &brackets,
+                              std::stoi(fields[2]), levelsFrom(fields[3]), numbersFrom(fields[4]),
+                              fields[0], tally);
+  }
+  std::cout << tally.report("BidiCharacterTest.txt") << "\n";
+  EXPECT_GT(tally.cases, 0u);
+  EXPECT_EQ(tally.failed(), 0u) << tally.report("BidiCharacterTest.txt");
 }
 
 }  // namespace
