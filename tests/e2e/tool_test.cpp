@@ -242,8 +242,8 @@ TEST(Tool, RenderTellsTheEffectItsLayerAndSpansThePicture) {
       {{"--set", "clipStartPos=-5,-5"}, "(-5, -5)", "(24, -13.5)"},
   };
   for (const Case& c : cases) {
-    std::vector<std::string> arguments = {"render", in, "-o", out, "--trace",
-                                          "--set=blendType=Screen"};
+    std::vector<std::string> arguments = {"render", in,        "-o",
+                                          out,      "--trace", "--set=blendType=Screen"};
     arguments.insert(arguments.end(), c.options.begin(), c.options.end());
     const ToolRun run = runTool(arguments);
     ASSERT_EQ(run.exitCode, 0) << run.err;
@@ -311,6 +311,28 @@ TEST(Tool, FontsListsTheCatalogueAndFindsNames) {
   const ToolRun help = runTool({"help"});  // vtpl-host help prints the usage
   EXPECT_EQ(help.exitCode, 0);
   EXPECT_EQ(help.out.rfind("usage: vtpl-host COMMAND", 0), 0u) << help.out;
+}
+
+// vtpl-text bidi on a mixed sentence typed with escapes: classes, levels and the visual order.
+TEST(VtplTextTool, PrintsLevelsAndVisualOrderOfAMixedSentence) {
+  const ToolRun run = runTool({"bidi", "ok \\u05D0\\u05D1 12!"}, "", "", VTPL_TEXT_TOOL_PATH);
+  EXPECT_EQ(run.exitCode, 0) << run.err;
+  for (const char* line :
+       {"paragraph 1: level 0", "  U+05D0  R    1", "  U+0031  EN   2", "  U+0021  ON   0",
+        "  visual order: U+006F U+006B U+0020 U+0031 U+0032 U+0020 U+05D1 "
+        "U+05D0 U+0021"}) {
+    EXPECT_NE(run.out.find(std::string(line) + "\n"), std::string::npos) << line << "\n" << run.out;
+  }
+  const ToolRun rightToLeft = runTool({"bidi", "--rtl", "ok"}, "", "", VTPL_TEXT_TOOL_PATH);
+  EXPECT_NE(rightToLeft.out.find("  U+006F  L    2\n"), std::string::npos) << rightToLeft.out;
+  for (const std::vector<std::string>& wrong : {std::vector<std::string>{"bidi", "\\u05"},
+                                                {"bidi"},
+                                                {"levels", "a"},
+                                                {"bidi", "--up", "a"}}) {
+    const ToolRun failed = runTool(wrong, "", "", VTPL_TEXT_TOOL_PATH);
+    EXPECT_EQ(failed.exitCode, 2);
+    EXPECT_NE(failed.err.find("usage: vtpl-text bidi"), std::string::npos) << failed.err;
+  }
 }
 
 }  // namespace
