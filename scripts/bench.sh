@@ -7,13 +7,14 @@
 #                   both, for each mode and layout (--runs N)
 #   font_cache_bench  the font catalogue's first load and its lookups (--runs N)
 #   glyph_geometry_bench  outline building and triangulation of every DejaVu Sans glyph
-#   scripts/bench.sh [--only analysis|scope|fonts|glyphs] [--runs N] [--quick] [--no-ffmpeg]
+#   unicode_data_bench  the first Basic Latin query and loading the whole UnicodeData.txt (--runs N)
+#   scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode] [--runs N] [--quick] [--no-ffmpeg]
 #                    [--folder DIR]
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 
 usage() {
-  echo "usage: scripts/bench.sh [--only analysis|scope|fonts|glyphs] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
+  echo "usage: scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
   exit 2
 }
 
@@ -47,8 +48,8 @@ while (($# > 0)); do
       ;;
   esac
 done
-if [[ -n "$only" && ! "$only" =~ ^(analysis|scope|fonts|glyphs)$ ]]; then
-  echo "bench: --only takes analysis, scope, fonts or glyphs, not '$only'" >&2
+if [[ -n "$only" && ! "$only" =~ ^(analysis|scope|fonts|glyphs|unicode)$ ]]; then
+  echo "bench: --only takes analysis, scope, fonts, glyphs or unicode, not '$only'" >&2
   usage
 fi
 
@@ -68,4 +69,8 @@ if [[ -z "$only" || "$only" == fonts ]]; then
 fi
 if [[ -z "$only" || "$only" == glyphs ]]; then
   "$root/build/bench/glyph_geometry_bench"
+  [[ -n "$only" ]] || echo
+fi
+if [[ -z "$only" || "$only" == unicode ]]; then
+  "$root/build/bench/unicode_data_bench" "${scope_arguments[@]}"
 fi

@@ -7,6 +7,9 @@
 # FUZZ_TARGET=polygon_triangulation fuzzes the triangulator instead, FUZZ_TARGET=glyph_outline
 # the whole glyph geometry (contours to loops, containment tree and triangles); neither has seeds,
 # and their corpus and artifacts live in build-fuzz/fuzz/<target>_corpus/ and _artifacts/.
+# FUZZ_TARGET=unicode_data fuzzes the Unicode data file readers, seeded with the first lines of
+# the installed UnicodeData.txt and BidiBrackets.txt (joined by a 0xFF byte, as the target splits
+# its input).
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 seconds="${1:-600}"
@@ -18,9 +21,10 @@ fi
 
 target="${FUZZ_TARGET:-font_file_reader}"
 case "$target" in
-  font_file_reader | polygon_triangulation | glyph_outline) ;;
+  font_file_reader | polygon_triangulation | glyph_outline | unicode_data) ;;
   *)
-    echo "FUZZ_TARGET must be font_file_reader, polygon_triangulation or glyph_outline" >&2
+    echo "FUZZ_TARGET must be font_file_reader, polygon_triangulation, glyph_outline or" \
+      "unicode_data" >&2
     exit 2
     ;;
 esac
@@ -33,6 +37,22 @@ cmake -S "$root" -B "$build_dir" -G Ninja \
 work="$build_dir/fuzz"
 export ASAN_OPTIONS="${ASAN_OPTIONS:-detect_leaks=1}"
 export UBSAN_OPTIONS="${UBSAN_OPTIONS:-print_stacktrace=1}"
+if [[ "$target" == unicode_data ]]; then
+  cmake --build "$build_dir" --target unicode_data_fuzzer
+  corpus="$work/unicode_data_corpus"
+  artifacts="$work/unicode_data_artifacts"
+  seeds="$work/unicode_data_seeds"
+  mkdir -p "$corpus" "$artifacts" "$seeds"
+  for lines in 5 40 300; do
+    { head -n "$lines" /usr/share/unicode/UnicodeData.txt
+      printf '\xff'
+      head -n "$((lines + 40))" /usr/share/unicode/BidiBrackets.txt; } >"$seeds/first_$lines"
+  done
+  "$work/unicode_data_fuzzer" "$corpus" "$seeds" \
+    -max_len=16384 -max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 \
+    -artifact_prefix="$artifacts/" -print_final_stats=1 "$@"
+  exit
+fi
 if [[ "$target" != font_file_reader ]]; then
   cmake --build "$build_dir" --target "${target}_fuzzer"
   corpus="$work/${target}_corpus"
