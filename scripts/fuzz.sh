@@ -10,6 +10,7 @@
 # FUZZ_TARGET=unicode_data fuzzes the Unicode data file readers, seeded with the first lines of
 # the installed UnicodeData.txt and BidiBrackets.txt (joined by a 0xFF byte, as the target splits
 # its input).
+# FUZZ_TARGET=bidi fuzzes the bidi engine over token chains built from UTF-16 text (no seeds).
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 seconds="${1:-600}"
@@ -21,10 +22,10 @@ fi
 
 target="${FUZZ_TARGET:-font_file_reader}"
 case "$target" in
-  font_file_reader | polygon_triangulation | glyph_outline | unicode_data) ;;
+  font_file_reader | polygon_triangulation | glyph_outline | unicode_data | bidi) ;;
   *)
-    echo "FUZZ_TARGET must be font_file_reader, polygon_triangulation, glyph_outline or" \
-      "unicode_data" >&2
+    echo "FUZZ_TARGET must be font_file_reader, polygon_triangulation, glyph_outline," \
+      "unicode_data or bidi" >&2
     exit 2
     ;;
 esac
