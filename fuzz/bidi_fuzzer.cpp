@@ -3,7 +3,8 @@
 // each pair of bytes is one of the characters that stress the engine (embeddings, overrides,
 // isolates, brackets, strong and weak classes, breaks) repeated up to 64 times, so that a short
 // input nests thousands of levels. The result must hold every paragraph token and exactly the
-// characters X9 keeps, with levels between the paragraph level and 126.
+// characters X9 keeps, with levels between the paragraph level and 126 (down to 0 after a
+// character of class B, which ends a paragraph of the algorithm inside the token's paragraph).
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
@@ -64,7 +65,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   vesk::plugin::lib::resolveLevels(unicodeData, entries, first, direction);
 
   size_t next = 0;
-  int paragraphLevel = 0;
+  int lowest = 0;
   for (const TextToken* token = first.get(); token != nullptr; token = token->next.get()) {
     const bool kept = token->kind == TextToken::kParagraph ||
                       !removedByX9(unicodeData.bidiClass(token->codePoint));
@@ -75,9 +76,10 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     const int level = entries[next++].level;
     if (token->kind == TextToken::kParagraph) {
       check(level == 0 || level == 1, "a paragraph level is neither 0 nor 1");
-      paragraphLevel = level;
+      lowest = level;
     } else {
-      check(level >= paragraphLevel && level <= 126, "a level is out of range");
+      check(level >= lowest && level <= 126, "a level is out of range");
+      lowest = unicodeData.bidiClass(token->codePoint) == BidiClass::B ? 0 : lowest;
     }
   }
   check(next == entries.size(), "the result holds more than the kept tokens");

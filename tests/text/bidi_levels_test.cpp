@@ -49,6 +49,9 @@ TEST(BidiLevels, ChainsResolveParagraphByParagraph) {
       // A tab takes the paragraph level wherever it is.
       {u"a\tb", -1, "P1 61:2 9:1 62:2"},
       {u"\u05D0\nabc\u2029", 0, "P1 5D0:1 P0 61:0 62:0 63:0 P0"},
+      // A character of class B inside the token's paragraph ends a paragraph of the algorithm:
+      // the text after it takes its own direction (found by fuzzing).
+      {u"\u202D\u05D0\u001C\u001Ca", 0, "P1 5D0:2 1C:1 1C:0 61:0"},
       {u"abc", 1, "P0 61:0 62:0 63:0"},
       {u"\u05D0", 1, "P0 5D0:1"},
   };
