@@ -8,13 +8,14 @@
 #   font_cache_bench  the font catalogue's first load and its lookups (--runs N)
 #   glyph_geometry_bench  outline building and triangulation of every DejaVu Sans glyph
 #   unicode_data_bench  the first Basic Latin query and loading the whole UnicodeData.txt (--runs N)
-#   scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode] [--runs N] [--quick] [--no-ffmpeg]
+#   bidi_bench      bidi resolution of a 10,000-character mixed Arabic and Latin paragraph (--runs N)
+#   scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode|bidi] [--runs N] [--quick] [--no-ffmpeg]
 #                    [--folder DIR]
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 
 usage() {
-  echo "usage: scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
+  echo "usage: scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode|bidi] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
   exit 2
 }
 
@@ -48,8 +49,8 @@ while (($# > 0)); do
       ;;
   esac
 done
-if [[ -n "$only" && ! "$only" =~ ^(analysis|scope|fonts|glyphs|unicode)$ ]]; then
-  echo "bench: --only takes analysis, scope, fonts, glyphs or unicode, not '$only'" >&2
+if [[ -n "$only" && ! "$only" =~ ^(analysis|scope|fonts|glyphs|unicode|bidi)$ ]]; then
+  echo "bench: --only takes analysis, scope, fonts, glyphs, unicode or bidi, not '$only'" >&2
   usage
 fi
 
@@ -73,4 +74,8 @@ if [[ -z "$only" || "$only" == glyphs ]]; then
 fi
 if [[ -z "$only" || "$only" == unicode ]]; then
   "$root/build/bench/unicode_data_bench" "${scope_arguments[@]}"
+  [[ -n "$only" ]] || echo
+fi
+if [[ -z "$only" || "$only" == bidi ]]; then
+  "$root/build/bench/bidi_bench" "${scope_arguments[@]}"
 fi
