@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "bench_runs.h"
 #include "gl/framebuffer.h"
 #include "gl/quad_maths.h"
 #include "gl_test_host.h"
@@ -19,6 +20,8 @@
 #include "scope/waveform_analysis.h"
 
 namespace {
+
+using waveform_bench::median;
 
 using namespace plugin::Scopes;
 using Clock = std::chrono::steady_clock;
@@ -75,11 +78,6 @@ vtpl::HostTexture upload(const vtpl::host::Image& image, bool asFloat) {
   layer.height = layer.allocatedHeight = static_cast<uint32_t>(image.height);
   layer.uMax = layer.vMax = 1.0f;
   return layer;
-}
-
-double median(std::vector<double> values) {
-  std::sort(values.begin(), values.end());
-  return values[values.size() / 2];
 }
 
 double secondsOf(const std::string& command) {

@@ -9,16 +9,14 @@
 #include <string>
 #include <vector>
 
+#include "bench_runs.h"
 #include "text/bidi_levels.h"
 
 namespace {
 
-using Clock = std::chrono::steady_clock;
+using waveform_bench::median;
 
-double median(std::vector<double> values) {
-  std::sort(values.begin(), values.end());
-  return values[values.size() / 2];
-}
+using Clock = std::chrono::steady_clock;
 
 // Words of Arabic and Latin, numbers of both kinds, brackets and punctuation, cycled.
 std::u32string mixedParagraph(size_t length) {
@@ -40,14 +38,9 @@ std::u32string mixedParagraph(size_t length) {
 }  // namespace
 
 int main(int argc, char** argv) {
-  int runs = 50;
-  for (int i = 1; i < argc; ++i) {
-    if (std::string(argv[i]) == "--runs" && i + 1 < argc) {
-      runs = std::max(1, std::atoi(argv[++i]));
-    } else {
-      std::fprintf(stderr, "usage: bidi_bench [--runs N]\n");
-      return 2;
-    }
+  const int runs = waveform_bench::runsOption(argc, argv, 50, "bidi_bench");
+  if (runs < 0) {
+    return 2;
   }
   constexpr size_t kLength = 10000;
   vesk::plugin::lib::UnicodeHelper unicodeData(WAVEFORM_BUILD_DIR);

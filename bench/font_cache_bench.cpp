@@ -8,9 +8,12 @@
 #include <string>
 #include <vector>
 
+#include "bench_runs.h"
 #include "fonts/font_cache.h"
 
 namespace {
+
+using waveform_bench::median;
 
 using Clock = std::chrono::steady_clock;
 using vesk::project::FontCache;
@@ -19,22 +22,12 @@ double millisecondsSince(Clock::time_point start) {
   return std::chrono::duration<double, std::milli>(Clock::now() - start).count();
 }
 
-double median(std::vector<double> values) {
-  std::sort(values.begin(), values.end());
-  return values[values.size() / 2];
-}
-
 }  // namespace
 
 int main(int argc, char** argv) {
-  int runs = 3;
-  for (int i = 1; i < argc; ++i) {
-    if (std::string(argv[i]) == "--runs" && i + 1 < argc) {
-      runs = std::max(1, std::atoi(argv[++i]));
-    } else {
-      std::fprintf(stderr, "usage: font_cache_bench [--runs N]\n");
-      return 2;
-    }
+  const int runs = waveform_bench::runsOption(argc, argv, 3, "font_cache_bench");
+  if (runs < 0) {
+    return 2;
   }
   std::vector<double> services;
   std::vector<double> loads;

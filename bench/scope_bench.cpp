@@ -14,6 +14,7 @@
 #include <utility>
 #include <vector>
 
+#include "bench_runs.h"
 #include "effect_host.h"
 #include "gl_thread.h"
 #include "image.h"
@@ -21,6 +22,8 @@
 #include "test_frame.h"
 
 namespace {
+
+using waveform_bench::median;
 
 using namespace vtpl::host;
 using Clock = std::chrono::steady_clock;
@@ -47,11 +50,6 @@ struct Timing {
   double control = 0;  // milliseconds
   double together = 0;
 };
-
-double median(std::vector<double> values) {
-  std::sort(values.begin(), values.end());
-  return values[values.size() / 2];
-}
 
 double millisecondsSince(Clock::time_point start) {
   return std::chrono::duration<double, std::milli>(Clock::now() - start).count();

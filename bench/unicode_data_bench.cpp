@@ -11,6 +11,7 @@
 #include <string>
 #include <vector>
 
+#include "bench_runs.h"
 #include "text/unicode_blocks.h"
 #include "text/unicode_helper.h"
 
@@ -27,21 +28,15 @@ double medianMilliseconds(int runs, const std::function<void()>& work) {
     work();
     times.push_back(std::chrono::duration<double, std::milli>(Clock::now() - start).count());
   }
-  std::sort(times.begin(), times.end());
-  return times[times.size() / 2];
+  return waveform_bench::median(times);
 }
 
 }  // namespace
 
 int main(int argc, char** argv) {
-  int runs = 9;
-  for (int i = 1; i < argc; ++i) {
-    if (std::string(argv[i]) == "--runs" && i + 1 < argc) {
-      runs = std::max(1, std::atoi(argv[++i]));
-    } else {
-      std::fprintf(stderr, "usage: unicode_data_bench [--runs N]\n");
-      return 2;
-    }
+  const int runs = waveform_bench::runsOption(argc, argv, 9, "unicode_data_bench");
+  if (runs < 0) {
+    return 2;
   }
   const char* folder = WAVEFORM_BUILD_DIR;
   size_t latin = 0;

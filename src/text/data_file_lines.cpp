@@ -86,4 +86,15 @@ std::optional<uint32_t> parseCodePoint(std::string_view field) {
   return value;
 }
 
+std::optional<DataFields> DataFileLines::nextFields(size_t& skipped) {
+  for (Status status; (status = next()) != Status::kEnd;) {
+    if (status == Status::kOverlong) {
+      ++skipped;
+    } else if (line_.find_first_not_of(" \t\r") != std::string_view::npos) {
+      return splitFields(line_);
+    }
+  }
+  return std::nullopt;
+}
+
 }  // namespace vesk::plugin::lib

@@ -14,6 +14,16 @@
 
 namespace vesk::plugin::lib {
 
+// The fields of a data line split at ";", each trimmed of spaces, tabs and carriage returns.
+// Fields beyond the capacity are counted but not kept.
+struct DataFields {
+  static constexpr size_t kCapacity = 16;
+  std::array<std::string_view, kCapacity> at;
+  size_t count = 0;
+  std::string_view operator[](size_t i) const { return i < count && i < kCapacity ? at[i] : ""; }
+};
+DataFields splitFields(std::string_view line);
+
 class DataFileLines {
  public:
   static constexpr size_t kMaxLineLength = 4095;
@@ -26,6 +36,9 @@ class DataFileLines {
   // Reads the next line. kLine: line() holds it; kOverlong: a line longer than kMaxLineLength
   // bytes was passed over; kEnd: the file ends (or cannot be read on).
   Status next();
+  // The fields of the next line that holds data: blank and comment-only lines are passed over,
+  // and so are overlong ones, counted in `skipped`. None at the file's end.
+  std::optional<DataFields> nextFields(size_t& skipped);
   // The last line read, without its line end and without a comment ("#" to the end).
   std::string_view line() const { return line_; }
   // The byte offset at which the last line read starts (the file's end after kEnd).
@@ -39,15 +52,6 @@ class DataFileLines {
   uint64_t offset_ = 0;
 };
 
-// The fields of a data line split at ";", each trimmed of spaces, tabs and carriage returns.
-// Fields beyond the capacity are counted but not kept.
-struct DataFields {
-  static constexpr size_t kCapacity = 16;
-  std::array<std::string_view, kCapacity> at;
-  size_t count = 0;
-  std::string_view operator[](size_t i) const { return i < count && i < kCapacity ? at[i] : ""; }
-};
-DataFields splitFields(std::string_view line);
 
 // A code point written as 1 to 8 hexadecimal digits and nothing else, at most U+10FFFF; none for
 // anything else (an empty field, other characters, a number too large).

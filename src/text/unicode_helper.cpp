@@ -76,10 +76,6 @@ BracketType bracketType(std::string_view field) {
                         : BracketType::kNone;
 }
 
-bool isBlank(std::string_view line) {
-  return line.find_first_not_of(" \t\r") == std::string_view::npos;
-}
-
 }  // namespace
 
 UnicodeHelper::UnicodeHelper(std::filesystem::path dataFolder)
@@ -93,15 +89,8 @@ void UnicodeHelper::readBracketFile() {
     return;
   }
   bracketFileOpened_ = true;
-  for (DataFileLines::Status status; (status = lines.next()) != DataFileLines::Status::kEnd;) {
-    if (status == DataFileLines::Status::kOverlong) {
-      ++skippedLines_;
-      continue;
-    }
-    if (isBlank(lines.line())) {
-      continue;
-    }
-    const DataFields fields = splitFields(lines.line());
+  while (const std::optional<DataFields> line = lines.nextFields(skippedLines_)) {
+    const DataFields& fields = *line;
     const auto codePoint = parseCodePoint(fields[0]);
     const auto pair = parseCodePoint(fields[1]);
     if (fields.count < 3 || !codePoint || !pair) {
@@ -130,15 +119,8 @@ void UnicodeHelper::readCharacterFile(uint32_t limit) {
     return;
   }
   characterFileOpened_ = true;
-  for (DataFileLines::Status status; (status = lines.next()) != DataFileLines::Status::kEnd;) {
-    if (status == DataFileLines::Status::kOverlong) {
-      ++skippedLines_;
-      continue;
-    }
-    if (isBlank(lines.line())) {
-      continue;
-    }
-    const DataFields fields = splitFields(lines.line());
+  while (const std::optional<DataFields> line = lines.nextFields(skippedLines_)) {
+    const DataFields& fields = *line;
     const auto codePoint = parseCodePoint(fields[0]);
     if (!codePoint) {
       ++skippedLines_;
