@@ -86,15 +86,16 @@ std::optional<uint32_t> parseCodePoint(std::string_view field) {
   return value;
 }
 
-std::optional<DataFields> DataFileLines::nextFields(size_t& skipped) {
+const DataFields* DataFileLines::nextFields(size_t& skipped) {
   for (Status status; (status = next()) != Status::kEnd;) {
     if (status == Status::kOverlong) {
       ++skipped;
     } else if (line_.find_first_not_of(" \t\r") != std::string_view::npos) {
-      return splitFields(line_);
+      fields_ = splitFields(line_);
+      return &fields_;
     }
   }
-  return std::nullopt;
+  return nullptr;
 }
 
 }  // namespace vesk::plugin::lib

@@ -36,9 +36,10 @@ class DataFileLines {
   // Reads the next line. kLine: line() holds it; kOverlong: a line longer than kMaxLineLength
   // bytes was passed over; kEnd: the file ends (or cannot be read on).
   Status next();
-  // The fields of the next line that holds data: blank and comment-only lines are passed over,
-  // and so are overlong ones, counted in `skipped`. None at the file's end.
-  std::optional<DataFields> nextFields(size_t& skipped);
+  // The fields of the next line that holds data, valid until the next read: blank and
+  // comment-only lines are passed over, and so are overlong ones, counted in `skipped`. Null at
+  // the file's end.
+  const DataFields* nextFields(size_t& skipped);
   // The last line read, without its line end and without a comment ("#" to the end).
   std::string_view line() const { return line_; }
   // The byte offset at which the last line read starts (the file's end after kEnd).
@@ -48,6 +49,7 @@ class DataFileLines {
   std::ifstream in_;
   std::array<char, kMaxLineLength + 1> buffer_{};
   std::string_view line_;
+  DataFields fields_;
   uint64_t lineStart_ = 0;
   uint64_t offset_ = 0;
 };

@@ -89,7 +89,7 @@ void UnicodeHelper::readBracketFile() {
     return;
   }
   bracketFileOpened_ = true;
-  while (const std::optional<DataFields> line = lines.nextFields(skippedLines_)) {
+  while (const DataFields* line = lines.nextFields(skippedLines_)) {
     const DataFields& fields = *line;
     const auto codePoint = parseCodePoint(fields[0]);
     const auto pair = parseCodePoint(fields[1]);
@@ -119,7 +119,7 @@ void UnicodeHelper::readCharacterFile(uint32_t limit) {
     return;
   }
   characterFileOpened_ = true;
-  while (const std::optional<DataFields> line = lines.nextFields(skippedLines_)) {
+  while (const DataFields* line = lines.nextFields(skippedLines_)) {
     const DataFields& fields = *line;
     const auto codePoint = parseCodePoint(fields[0]);
     if (!codePoint) {
