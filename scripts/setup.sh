@@ -9,7 +9,7 @@ set -euo pipefail
 packages=(
   build-essential cmake ninja-build pkg-config binutils clang-format
   libglew-dev libegl-dev libgl-dev libegl-mesa0 libgl1-mesa-dri
-  libfreetype-dev libharfbuzz-dev zlib1g-dev libfontconfig-dev fontconfig fonts-dejavu-core
+  libfreetype-dev libharfbuzz-dev libharfbuzz-bin zlib1g-dev libfontconfig-dev fontconfig fonts-dejavu-core
   fonts-cantarell fonts-inter-variable fonts-wqy-microhei fonts-urw-base35 libpolyclipping-dev
   libpng-dev unicode-data
   libgtest-dev libgmock-dev libbenchmark-dev
