@@ -9,13 +9,15 @@
 #   glyph_geometry_bench  outline building and triangulation of every DejaVu Sans glyph
 #   unicode_data_bench  the first Basic Latin query and loading the whole UnicodeData.txt (--runs N)
 #   bidi_bench      bidi resolution of a 10,000-character mixed Arabic and Latin paragraph (--runs N)
-#   scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode|bidi] [--runs N] [--quick] [--no-ffmpeg]
+#   shaping_bench   shaping the 15 scope labels (quiet and verbose) and a 2,000-character mixed
+#                   paragraph (--runs N)
+#   scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode|bidi|shaping] [--runs N] [--quick] [--no-ffmpeg]
 #                    [--folder DIR]
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 
 usage() {
-  echo "usage: scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode|bidi] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
+  echo "usage: scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode|bidi|shaping] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
   exit 2
 }
 
@@ -49,8 +51,8 @@ while (($# > 0)); do
       ;;
   esac
 done
-if [[ -n "$only" && ! "$only" =~ ^(analysis|scope|fonts|glyphs|unicode|bidi)$ ]]; then
-  echo "bench: --only takes analysis, scope, fonts, glyphs, unicode or bidi, not '$only'" >&2
+if [[ -n "$only" && ! "$only" =~ ^(analysis|scope|fonts|glyphs|unicode|bidi|shaping)$ ]]; then
+  echo "bench: --only takes analysis, scope, fonts, glyphs, unicode, bidi or shaping, not '$only'" >&2
   usage
 fi
 
@@ -78,4 +80,8 @@ if [[ -z "$only" || "$only" == unicode ]]; then
 fi
 if [[ -z "$only" || "$only" == bidi ]]; then
   "$root/build/bench/bidi_bench" "${scope_arguments[@]}"
+  [[ -n "$only" ]] || echo
+fi
+if [[ -z "$only" || "$only" == shaping ]]; then
+  "$root/build/bench/shaping_bench" "${scope_arguments[@]}"
 fi
