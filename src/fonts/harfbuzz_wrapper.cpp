@@ -82,13 +82,18 @@ void HarfBuzzWrapper::shape(const std::vector<uint32_t>& codePoints, uint8_t bid
     hb_buffer_clear_contents(buffer_);
     bufferClean_ = 1;
   }
+  // HarfBuzz's empty font would hand the code points back as glyph ids; without a face there
+  // are no glyphs to give.
+  if (font_ == nullptr) {
+    return;
+  }
   const int length = static_cast<int>(codePoints.size());
   hb_buffer_add_utf32(buffer_, codePoints.data(), length, 0, length);
   hb_buffer_guess_segment_properties(buffer_);
   bufferClean_ = 0;
   // The embedding level decides the direction, whatever the script would suggest.
   hb_buffer_set_direction(buffer_, (bidiLevel & 1) != 0 ? HB_DIRECTION_RTL : HB_DIRECTION_LTR);
-  hb_shape(font_ != nullptr ? font_ : hb_font_get_empty(), buffer_, nullptr, 0);
+  hb_shape(font_, buffer_, nullptr, 0);
 }
 
 std::vector<ShapedGlyph> HarfBuzzWrapper::shapedGlyphs() const {

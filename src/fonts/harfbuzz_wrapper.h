@@ -64,7 +64,7 @@ class HarfBuzzWrapper {
 
   // Shapes a run of UTF-32 code points at bidirectional embedding level `bidiLevel`: left to
   // right at even levels, right to left at odd ones; script and language are guessed from the
-  // text. Without a bound face every glyph is glyph 0 with no advance.
+  // text. Without a bound face the run gives no glyphs.
   void shape(const std::vector<uint32_t>& codePoints, uint8_t bidiLevel);
   // The glyphs of the last run shaped, in buffer (visual) order.
   std::vector<ShapedGlyph> shapedGlyphs() const;

@@ -96,6 +96,19 @@ TEST_F(HarfBuzzWrapperTest, AnUnpairedSurrogateBecomesTheReplacementGlyph) {
   EXPECT_NE(glyphs[1].info.glyphIndex, 0u);
 }
 
+TEST_F(HarfBuzzWrapperTest, WithoutAFaceARunGivesNoGlyphs) {
+  for (bool released : {false, true}) {
+    HarfBuzzWrapper wrapper;
+    if (released) {
+      wrapper.setFace(dejaVu_.get());
+      wrapper.shape({'-', '2'}, 0);
+      wrapper.releaseFont();
+    }
+    wrapper.shape({'-', '2'}, 0);
+    EXPECT_TRUE(wrapper.shapedGlyphs().empty()) << released;
+  }
+}
+
 TEST_F(HarfBuzzWrapperTest, AdvancesFollowTheFaceSizeAfterASizeChange) {
   wrapper_.shape({'H'}, 0);
   const int32_t at48 = wrapper_.shapedGlyphs()[0].position.xAdvance;
