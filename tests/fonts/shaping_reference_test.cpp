@@ -84,24 +84,16 @@ std::vector<uint32_t> codePointsOf(const std::string& utf8) {
   return codePoints;
 }
 
-// One glyph as both sides report it, printed as hb-shape's text output does.
-struct Glyph {
-  uint32_t id, cluster;
-  int32_t dx, dy, ax, ay;
-  bool operator==(const Glyph& o) const {
-    return id == o.id && cluster == o.cluster && dx == o.dx && dy == o.dy && ax == o.ax &&
-           ay == o.ay;
-  }
-};
-
-std::ostream& operator<<(std::ostream& out, const Glyph& g) {
-  return out << g.id << '=' << g.cluster << '@' << g.dx << ',' << g.dy << '+' << g.ax << ','
-             << g.ay;
+// One glyph as hb-shape's text output prints it: [id=cluster@dx,dy+ax,ay].
+std::string glyphText(uint32_t id, uint32_t cluster, int dx, int dy, int ax, int ay) {
+  std::ostringstream out;
+  out << '[' << id << '=' << cluster << '@' << dx << ',' << dy << '+' << ax << ',' << ay << ']';
+  return out.str();
 }
 
-// hb-shape's JSON output with glyph ids: [{"g":36,"cl":0,"dx":0,"dy":0,"ax":1906,"ay":0},...].
-// An empty result means hb-shape could not be run.
-std::vector<Glyph> referenceGlyphs(const FontRuns& font, const TextRun& run) {
+// The glyphs of hb-shape's JSON output with glyph ids:
+// [{"g":36,"cl":0,"dx":0,"dy":0,"ax":1906,"ay":0},...]; empty when hb-shape could not be run.
+std::string referenceGlyphs(const FontRuns& font, const TextRun& run) {
   std::ostringstream command;
   command << "LC_ALL=C hb-shape --font-funcs=ft --font-size=" << kPixelSize * 64
           << " --face-index=" << font.faceIndex << " --no-glyph-names --output-format=json"
@@ -120,33 +112,26 @@ std::vector<Glyph> referenceGlyphs(const FontRuns& font, const TextRun& run) {
     }
     pclose(pipe);
   }
-  std::vector<Glyph> glyphs;
+  std::string glyphs;
   for (size_t at = output.find('{'); at != std::string::npos; at = output.find('{', at + 1)) {
-    Glyph g{};
-    if (std::sscanf(output.c_str() + at, R"({"g":%u,"cl":%u,"dx":%d,"dy":%d,"ax":%d,"ay":%d})",
-                    &g.id, &g.cluster, &g.dx, &g.dy, &g.ax, &g.ay) == 6) {
-      glyphs.push_back(g);
+    unsigned id, cluster;
+    int dx, dy, ax, ay;
+    if (std::sscanf(output.c_str() + at, R"({"g":%u,"cl":%u,"dx":%d,"dy":%d,"ax":%d,"ay":%d})", &id,
+                    &cluster, &dx, &dy, &ax, &ay) == 6) {
+      glyphs += glyphText(id, cluster, dx, dy, ax, ay);
     }
   }
   return glyphs;
 }
 
-std::vector<Glyph> wrapperGlyphs(HarfBuzzWrapper& wrapper, const TextRun& run) {
+std::string wrapperGlyphs(HarfBuzzWrapper& wrapper, const TextRun& run) {
   wrapper.shape(codePointsOf(run.text), run.level);
-  std::vector<Glyph> glyphs;
-  for (const ShapedGlyph& s : wrapper.shapedGlyphs()) {
-    glyphs.push_back({s.info.glyphIndex, s.info.cluster, s.position.xOffset, s.position.yOffset,
-                      s.position.xAdvance, s.position.yAdvance});
+  std::string glyphs;
+  for (const ShapedGlyph& g : wrapper.shapedGlyphs()) {
+    glyphs += glyphText(g.info.glyphIndex, g.info.cluster, g.position.xOffset, g.position.yOffset,
+                        g.position.xAdvance, g.position.yAdvance);
   }
   return glyphs;
-}
-
-std::string printed(const std::vector<Glyph>& glyphs) {
-  std::ostringstream out;
-  for (const Glyph& g : glyphs) {
-    out << '[' << g << ']';
-  }
-  return out.str();
 }
 
 class ShapingReference : public testing::TestWithParam<FontRuns> {};
@@ -160,9 +145,9 @@ TEST_P(ShapingReference, EveryRunShapesAsHbShapeDoes) {
   HarfBuzzWrapper wrapper;
   wrapper.setFace(face.get());
   for (const TextRun& run : font.runs) {
-    const std::vector<Glyph> expected = referenceGlyphs(font, run);
+    const std::string expected = referenceGlyphs(font, run);
     ASSERT_FALSE(expected.empty()) << "hb-shape gave no glyphs for \"" << run.text << '"';
-    EXPECT_EQ(printed(wrapperGlyphs(wrapper, run)), printed(expected))
+    EXPECT_EQ(wrapperGlyphs(wrapper, run), expected)
         << font.path << " \"" << run.text << "\" level " << int{run.level};
   }
 }
