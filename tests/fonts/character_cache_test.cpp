@@ -10,6 +10,7 @@
 #include <atomic>
 #include <cmath>
 #include <map>
+#include <set>
 #include <string>
 #include <thread>
 #include <tuple>
@@ -77,6 +78,37 @@ TEST(LFUCache, EvictsWholeFontsLeastRecentlyUsedFirst) {
     EXPECT_EQ(cache.keys(), c.keys) << c.name;
     EXPECT_EQ(cache.count(), c.count) << c.name;
   }
+}
+
+// Puts and gets from two threads at once: the count stays the sum of the cached items.
+TEST(LFUCache, TwoThreadsKeepTheCountOfTheCachedItems) {
+  CharacterCache cache(5);
+  const std::vector<std::u16string> keys = {u"A", u"B", u"C", u"D", u"E", u"F"};
+  const std::vector<CharacterCacheItemPtr> items = {itemOf(1), itemOf(2), itemOf(3)};
+  const auto hammer = [&](int thread) {
+    CharacterCacheItemPtr item;
+    for (int i = 0; i < 500000; ++i) {
+      const std::u16string& key = keys[(i + thread) % keys.size()];
+      if (i % 3 == thread) {
+        cache.put(key, items[i % items.size()]);
+      } else {
+        cache.get(key, item);
+      }
+    }
+  };
+  std::thread other(hammer, 1);
+  hammer(0);
+  other.join();
+  int32_t held = 0;
+  const std::vector<std::u16string> cached = cache.keys();
+  for (const std::u16string& key : cached) {
+    CharacterCacheItemPtr item;
+    ASSERT_TRUE(cache.get(key, item));
+    held += static_cast<int32_t>(item->size());
+  }
+  EXPECT_EQ(std::set<std::u16string>(cached.begin(), cached.end()).size(), cached.size());
+  EXPECT_EQ(cache.count(), held);
+  EXPECT_LE(held, 5);
 }
 
 TEST(CharacterCacheKey, NamesTheFaceAndInstance) {
@@ -161,6 +193,20 @@ TEST(CharacterOutline, AHitLeavesTheOutlineUntouched) {
   EXPECT_EQ(narrow->contours[0].bandVertices, bands);
   EXPECT_EQ(narrow->contours[0].path.points, points);
   EXPECT_EQ(wide->outerBandWidth, 4.0f);
+}
+
+// The other thread caches the same outline while this one builds it: both get the cached one.
+TEST(CharacterOutline, AnOutlineCachedDuringABuildWins) {
+  CharacterCache cache(kCharacterCacheCapacity);
+  CharacterOutlinePtr other;
+  const GlyphProducer produce = [&](uint32_t index, float size) {
+    if (other == nullptr) {
+      other = characterOutline(cache, u"F", {index, size, 1}, squareGlyph);
+    }
+    return squareGlyph(index, size);
+  };
+  EXPECT_EQ(characterOutline(cache, u"F", {3, 20, 1}, produce), other);
+  EXPECT_EQ(cache.count(), 1);
 }
 
 TEST(CharacterOutline, RejectsSizesAndBandWidthsThatCannotBeBuilt) {
