@@ -7,17 +7,18 @@
 #                   both, for each mode and layout (--runs N)
 #   font_cache_bench  the font catalogue's first load and its lookups (--runs N)
 #   glyph_geometry_bench  outline building and triangulation of every DejaVu Sans glyph
+#   character_cache_bench  outline requests for the labels' glyphs, empty and filled cache (--runs N)
 #   unicode_data_bench  the first Basic Latin query and loading the whole UnicodeData.txt (--runs N)
 #   bidi_bench      bidi resolution of a 10,000-character mixed Arabic and Latin paragraph (--runs N)
 #   shaping_bench   shaping the 15 scope labels (quiet and verbose) and a 2,000-character mixed
 #                   paragraph (--runs N)
-#   scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode|bidi|shaping] [--runs N] [--quick] [--no-ffmpeg]
-#                    [--folder DIR]
+#   scripts/bench.sh [--only analysis|scope|fonts|glyphs|cache|unicode|bidi|shaping] [--runs N]
+#                    [--quick] [--no-ffmpeg] [--folder DIR]
 set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 
 usage() {
-  echo "usage: scripts/bench.sh [--only analysis|scope|fonts|glyphs|unicode|bidi|shaping] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
+  echo "usage: scripts/bench.sh [--only analysis|scope|fonts|glyphs|cache|unicode|bidi|shaping] [--runs N] [--quick] [--no-ffmpeg] [--folder DIR]" >&2
   exit 2
 }
 
@@ -51,8 +52,8 @@ while (($# > 0)); do
       ;;
   esac
 done
-if [[ -n "$only" && ! "$only" =~ ^(analysis|scope|fonts|glyphs|unicode|bidi|shaping)$ ]]; then
-  echo "bench: --only takes analysis, scope, fonts, glyphs, unicode, bidi or shaping, not '$only'" >&2
+if [[ -n "$only" && ! "$only" =~ ^(analysis|scope|fonts|glyphs|cache|unicode|bidi|shaping)$ ]]; then
+  echo "bench: --only takes analysis, scope, fonts, glyphs, cache, unicode, bidi or shaping, not '$only'" >&2
   usage
 fi
 
@@ -72,6 +73,10 @@ if [[ -z "$only" || "$only" == fonts ]]; then
 fi
 if [[ -z "$only" || "$only" == glyphs ]]; then
   "$root/build/bench/glyph_geometry_bench"
+  [[ -n "$only" ]] || echo
+fi
+if [[ -z "$only" || "$only" == cache ]]; then
+  "$root/build/bench/character_cache_bench" "${scope_arguments[@]}"
   [[ -n "$only" ]] || echo
 fi
 if [[ -z "$only" || "$only" == unicode ]]; then
