@@ -1,0 +1,235 @@
+// The font object on installed fonts and on broken files: faces and named instances selected,
+// shaping and outlines equal to the same work done directly on the same face, and no face left
+// half-selected after a failure.
+#include "fonts/freetype_font.h"
+
+#include <gtest/gtest.h>
+
+#include <ft2build.h>
+#include FT_FREETYPE_H
+
+#include <algorithm>
+#include <cstdlib>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <sstream>
+#include <string>
+#include <tuple>
+#include <vector>
+
+#include "ci_or_skip.h"
+#include "fonts/glyph_conversion.h"
+#include "freetype_face.h"
+#include "text/unicode_helper.h"
+
+namespace waveform_test {
+namespace {
+
+using namespace vesk::plugin::lib;
+using vesk::project::FontRecord;
+
+const char* const kDejaVu = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
+const char* const kInter = "/usr/share/fonts/truetype/inter-vf/Inter-roman.var.ttf";
+
+FontRecord recordFor(const std::string& path, const std::u16string& postScriptName,
+                     int32_t faceIndex = 0, int32_t instanceId = 0) {
+  FontRecord record;
+  record.filePath = std::u16string(path.begin(), path.end());
+  record.postScriptName = postScriptName;
+  record.faceIndex = faceIndex;
+  record.instanceId = instanceId;
+  return record;
+}
+
+// Glyph indices, clusters and positions of a run as text, for comparing and printing.
+std::string shapedText(HarfBuzzWrapper& wrapper, const std::u32string& text) {
+  wrapper.shape(std::vector<uint32_t>(text.begin(), text.end()), 0);
+  std::ostringstream out;
+  for (const ShapedGlyph& g : wrapper.shapedGlyphs()) {
+    out << g.info.glyphIndex << "@" << g.info.cluster << "+" << g.position.xAdvance << ","
+        << g.position.xOffset << "," << g.position.yOffset << " ";
+  }
+  return out.str();
+}
+
+std::vector<uint8_t> fileBytes(const std::string& path) {
+  std::ifstream file(path, std::ios::binary);
+  return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
+}
+
+class FreeTypeFontTest : public testing::Test {
+ protected:
+  void SetUp() override {
+    REQUIRE_FILE(kDejaVu);
+    REQUIRE_FILE(kInter);
+    char pattern[] = "/tmp/freetype_font_test_XXXXXX";
+    ASSERT_NE(mkdtemp(pattern), nullptr);
+    folder_ = pattern;
+  }
+  void TearDown() override {
+    if (!folder_.empty()) {
+      std::filesystem::remove_all(folder_);
+    }
+  }
+  std::string write(const std::string& name, const std::vector<uint8_t>& bytes) {
+    const std::string path = folder_ + "/" + name;
+    std::ofstream(path, std::ios::binary)
+        .write(reinterpret_cast<const char*>(bytes.data()),
+               static_cast<std::streamsize>(bytes.size()));
+    return path;
+  }
+
+  std::string folder_;
+  // No catalogue and no platform services: a face that cannot be opened has no fallback.
+  FreeTypeFont font_{nullptr};
+};
+
+TEST_F(FreeTypeFontTest, SelectsTheRecordsFaceAndNamedInstance) {
+  struct Case {
+    const char* path;
+    int32_t instanceId;
+    const char* family;
+    FT_Long instance;  // the named instance FreeType reports selected (1-based, 0 = none)
+  };
+  const Case cases[] = {{kDejaVu, 0, "DejaVu Sans", 0},
+                        {kInter, 272, "Inter", 1},  // Thin
+                        {kInter, 280, "Inter", 9},  // Black
+                        {kInter, 999, "Inter", 0},  // no such instance: the default one
+                        {kInter, 0, "Inter", 0}};
+  std::vector<std::string> advances;
+  for (const Case& c : cases) {
+    const std::u16string name = u"N" + std::u16string(1, char16_t('0' + advances.size()));
+    ASSERT_TRUE(font_.setFont(recordFor(c.path, name, 0, c.instanceId))) << c.path;
+    EXPECT_STREQ(font_.face()->family_name, c.family);
+    EXPECT_EQ(font_.face()->face_index >> 16, c.instance) << c.instanceId;
+    advances.push_back(shapedText(*font_.harfBuzz(), U"W"));
+  }
+  // The instance changes the glyphs' metrics, not just FreeType's bookkeeping.
+  EXPECT_NE(advances[1], advances[2]);
+  EXPECT_EQ(advances[3], advances[4]);
+}
+
+TEST_F(FreeTypeFontTest, ShapesLikeAWrapperOnTheSameFaceAndSize) {
+  font_.setVerbose(true);
+  EXPECT_TRUE(font_.harfBuzz()->verbose());
+  font_.setVerbose(false);
+  ASSERT_TRUE(font_.setFont(recordFor(kDejaVu, u"DejaVuSans")));
+  for (const unsigned size : {48u, 20u, 7u}) {
+    font_.setPixelSize(static_cast<float>(size));
+    FreeTypeFace face(kDejaVu, 0, size);
+    HarfBuzzWrapper standalone;
+    standalone.setFace(face.get());
+    const std::u32string label = U"IRE 100 \u2212 AVTo";
+    EXPECT_EQ(shapedText(*font_.harfBuzz(), label), shapedText(standalone, label)) << size;
+  }
+}
+
+TEST_F(FreeTypeFontTest, HandsOutOutlinesAsBuiltDirectlyFromTheFace) {
+  const FontRecord record = recordFor(kDejaVu, u"DejaVuSans");
+  ASSERT_TRUE(font_.setFont(record));
+  FreeTypeFace face(kDejaVu);
+  for (const float size : {20.0f, 12.5f, 0.5f}) {
+    for (const char letter : std::string("0g&")) {
+      const uint32_t index = FT_Get_Char_Index(face.get(), letter);
+      FT_Set_Pixel_Sizes(face.get(), 0, static_cast<FT_UInt>(std::max(1.0f, size)));
+      const auto direct = qvtl::geometry::makeCharacterOutline(
+          convertGlyph(face.get(), index, std::max(1.0f, size), record.filePath, 0),
+          glyphOutlineRequest(2, std::min(1.0f, size)));
+      const CharacterOutlinePtr outline = font_.characterOutline(index, record, size, 2);
+      ASSERT_FALSE(direct->vertices.empty());
+      EXPECT_EQ(std::tie(outline->vertices, outline->indices, outline->pixelSize),
+                std::tie(direct->vertices, direct->indices, direct->pixelSize))
+          << letter << " at " << size;
+    }
+  }
+}
+
+TEST_F(FreeTypeFontTest, AFailedSelectionLeavesNoFontCurrent) {
+  const FontRecord missing = recordFor(folder_ + "/missing.ttf", u"Missing");
+  const FontRecord dejaVu = recordFor(kDejaVu, u"DejaVuSans");
+  struct Step {
+    FontRecord record;
+    bool selected;
+    uint32_t fileReads;
+  };
+  const Step steps[] = {{missing, false, 0},      {missing, false, 0},  // asked again, fails again
+                        {FontRecord(), false, 0},                       // empty name, no face
+                        {dejaVu, true, 1},        {dejaVu, true, 1},    // the same font: no read
+                        {missing, false, 1},      {dejaVu, true, 2}};
+  for (const Step& s : steps) {
+    EXPECT_EQ(font_.setFont(s.record), s.selected);
+    EXPECT_EQ(font_.face() != nullptr, s.selected);
+    EXPECT_EQ(font_.currentFont().postScriptName, s.selected ? s.record.postScriptName : u"");
+    EXPECT_EQ(font_.fileReads(), s.fileReads);
+    if (!s.selected) {
+      EXPECT_EQ(shapedText(*font_.harfBuzz(), U"AB"), "");
+      EXPECT_THROW(font_.characterOutline(36, s.record, 20, 1), std::runtime_error);
+    }
+  }
+}
+
+TEST_F(FreeTypeFontTest, UntrustedFilesFailOrGiveEmptyResults) {
+  const std::vector<uint8_t> dejaVu = fileBytes(kDejaVu);
+  // Without 'cmap' and 'post' (FreeType makes a Unicode map from the glyph names in 'post'):
+  // their directory entries renamed.
+  std::vector<uint8_t> noCmap = dejaVu;
+  for (const char* table : {"cmap", "post"}) {
+    const auto directoryEnd = noCmap.begin() + 12 + 16 * 32;
+    const auto tag = std::search(noCmap.begin(), directoryEnd, table, table + 4);
+    ASSERT_NE(tag, directoryEnd) << table;
+    tag[3] = 'q';
+  }
+  const auto cut = [&](size_t size) {
+    return std::vector<uint8_t>(dejaVu.begin(), dejaVu.begin() + static_cast<long>(size));
+  };
+  struct Case {
+    std::string name;
+    std::vector<uint8_t> bytes;
+    int32_t faceIndex;
+    bool selected;
+    bool mapped = false;  // whether "A" maps to a glyph
+  };
+  const Case cases[] = {
+      {"garbage", std::vector<uint8_t>(5000, 0xA5), 0, false},
+      {"header", cut(12), 0, false},
+      {"directory", cut(400), 0, false},
+      {"half", cut(dejaVu.size() / 2), 0, false},
+      {"tail", cut(dejaVu.size() - 2000), 0, true, true},
+      {"nocmap", noCmap, 0, true},
+      {"past", dejaVu, 5, false},
+      {"negative", dejaVu, -1, false},
+      {"instance", dejaVu, 0x10000, false},
+  };
+  for (const Case& c : cases) {
+    const FontRecord record = recordFor(write(c.name + ".ttf", c.bytes),
+                                        std::u16string(c.name.begin(), c.name.end()), c.faceIndex);
+    ASSERT_EQ(font_.setFont(record), c.selected) << c.name;
+    if (!c.selected) {
+      EXPECT_EQ(font_.face(), nullptr) << c.name;
+      continue;
+    }
+    EXPECT_EQ(shapedText(*font_.harfBuzz(), U"A").rfind("0@", 0) != 0, c.mapped) << c.name;
+    // Whatever the face gives, shaping and outlines of its glyphs come back.
+    shapedText(*font_.harfBuzz(), U"AW\u05D0");
+    for (const ShapedGlyph& g : font_.harfBuzz()->shapedGlyphs()) {
+      EXPECT_NE(font_.characterOutline(g.info.glyphIndex, record, 20, 1), nullptr) << c.name;
+    }
+    EXPECT_NE(font_.characterOutline(36, record, 20, 1), nullptr) << c.name;
+  }
+}
+
+TEST_F(FreeTypeFontTest, MakesOneUnicodeHelperFromItsFolder) {
+  write("UnicodeData.txt",
+        {'0', '0', '4', '1', ';', 'A', ';', 'L', 'u', ';', '0', ';', 'L', ';', ';',
+         ';', ';', ';', 'N', ';', ';', ';', ';', '0', '0', '6', '1', ';', '\n'});
+  FreeTypeFont font(nullptr, nullptr, folder_);
+  const std::shared_ptr<UnicodeHelper> helper = font.unicodeHelper();
+  EXPECT_EQ(font.unicodeHelper(), helper);
+  EXPECT_EQ(helper->toLower('A'), uint32_t{'a'});
+  EXPECT_TRUE(helper->characterFileOpened());
+}
+
+}  // namespace
+}  // namespace waveform_test
