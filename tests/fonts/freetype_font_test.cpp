@@ -231,5 +231,42 @@ TEST_F(FreeTypeFontTest, MakesOneUnicodeHelperFromItsFolder) {
   EXPECT_TRUE(helper->characterFileOpened());
 }
 
+TEST_F(FreeTypeFontTest, SizesBelowOnePixelScaleAOnePixelFace) {
+  ASSERT_TRUE(font_.setFont(recordFor(kDejaVu, u"DejaVuSans")));
+  struct Case {
+    float size, pixelSize, scale;
+    FT_UShort facePixels;
+  };
+  const Case cases[] = {{0.5f, 1, 0.5f, 1}, {1.0f, 1, 1, 1}, {20.7f, 20.7f, 1, 20}, {-3, 1, -3, 1}};
+  for (const Case& c : cases) {
+    font_.setPixelSize(c.size);
+    EXPECT_EQ(std::make_tuple(font_.pixelSize(), font_.scale(), font_.face()->size->metrics.y_ppem),
+              std::make_tuple(c.pixelSize, c.scale, c.facePixels))
+        << c.size;
+  }
+}
+
+TEST_F(FreeTypeFontTest, FallsBackToThePlatformsDataThenToTheDefaultFont) {
+  FreeTypeFont font(std::make_shared<vesk::project::FontCache>(platform::systemServices()),
+                    platform::systemServices());
+  const FontRecord fallback = font.defaultFont();
+  ASSERT_NE(font.face(), nullptr);
+  const std::string defaultFamily = font.face()->family_name;
+  FontRecord moved = recordFor(folder_ + "/moved.ttf", u"DejaVuSans");
+  moved.familyName = u"DejaVu Sans";
+  FontRecord unknown = recordFor(write("garbage.ttf", std::vector<uint8_t>(100, 7)), u"Garbage");
+  unknown.familyName = u"No Such Family Anywhere";
+  FontRecord lost = recordFor(folder_ + "/lost.ttf", u"Lost");
+  lost.familyName = unknown.familyName;
+  const std::tuple<FontRecord, std::string> cases[] = {
+      {moved, "DejaVu Sans"}, {unknown, defaultFamily}, {lost, defaultFamily}};
+  for (const auto& [record, family] : cases) {
+    ASSERT_TRUE(font.setFont(record)) << family;
+    EXPECT_EQ(font.face()->family_name, family);
+    EXPECT_EQ(font.currentFont().postScriptName, record.postScriptName);
+  }
+  EXPECT_FALSE(fallback.postScriptName.empty());
+}
+
 }  // namespace
 }  // namespace waveform_test
