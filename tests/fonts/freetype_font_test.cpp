@@ -181,6 +181,21 @@ TEST_F(FreeTypeFontTest, UntrustedFilesFailOrGiveEmptyResults) {
     ASSERT_NE(tag, directoryEnd) << table;
     tag[3] = 'q';
   }
+  // Only a Microsoft symbol map: the Windows Unicode subtable relabelled (3, 0), every other
+  // subtable moved to an unknown platform.
+  std::vector<uint8_t> symbol = dejaVu;
+  const auto cmapEntry =
+      std::search(symbol.begin(), symbol.begin() + 12 + 16 * 32, "cmap", "cmap" + 4);
+  const auto read32 = [](auto at) {
+    return uint32_t{at[0]} << 24 | at[1] << 16 | at[2] << 8 | at[3];
+  };
+  const auto cmap = symbol.begin() + read32(cmapEntry + 8);
+  for (uint16_t i = 0; i < (cmap[2] << 8 | cmap[3]); ++i) {
+    const auto entry = cmap + 4 + 8 * i;
+    const bool windowsUnicode = entry[1] == 3 && entry[3] == 1;
+    entry[1] = windowsUnicode ? 3 : 99;
+    entry[3] = 0;
+  }
   const auto cut = [&](size_t size) {
     return std::vector<uint8_t>(dejaVu.begin(), dejaVu.begin() + static_cast<long>(size));
   };
@@ -198,6 +213,7 @@ TEST_F(FreeTypeFontTest, UntrustedFilesFailOrGiveEmptyResults) {
       {"half", cut(dejaVu.size() / 2), 0, false},
       {"tail", cut(dejaVu.size() - 2000), 0, true, true},
       {"nocmap", noCmap, 0, true},
+      {"symbol", symbol, 0, true, true},
       {"past", dejaVu, 5, false},
       {"negative", dejaVu, -1, false},
       {"instance", dejaVu, 0x10000, false},
