@@ -195,7 +195,9 @@ bool FreeTypeFont::setFont(const FontRecord& record) {
   releaseFace();
   currentFont_ = FontRecord();
 
-  bool isDefault = record.postScriptName == defaultFont_.postScriptName;
+  // Before the default is chosen no record is the default, not even one without a name.
+  const bool defaultChosen = !defaultFont_.postScriptName.empty() || !defaultFont_.fullName.empty();
+  bool isDefault = defaultChosen && record.postScriptName == defaultFont_.postScriptName;
   // The face (and named instance) to open in the data read: the record's, or the default
   // font's once the data are the default font's file.
   int32_t faceIndex = record.faceIndex;

@@ -46,7 +46,8 @@ class FreeTypeFont {
   vesk::project::FontRecord defaultFont();
 
   // Makes the record's face current: its file, else the platform's data for its family, else the
-  // default font. False when none opens; then no face is loaded and no font is current.
+  // default font. False when none opens; then no face is loaded and no font is current. Throws
+  // like defaultFont() when the default is needed and cannot be chosen.
   bool setFont(const vesk::project::FontRecord& record);
   // The face is set to max(1, size) whole pixels; below one pixel outlines are scaled down.
   void setPixelSize(float size);

@@ -265,6 +265,9 @@ TEST_F(FreeTypeFontTest, SizesBelowOnePixelScaleAOnePixelFace) {
 TEST_F(FreeTypeFontTest, FallsBackToThePlatformsDataThenToTheDefaultFont) {
   FreeTypeFont font(std::make_shared<vesk::project::FontCache>(platform::systemServices()),
                     platform::systemServices());
+  // A nameless record of a file FreeType cannot open, before the default is chosen.
+  const FontRecord nameless = recordFor(write("nameless.ttf", std::vector<uint8_t>(100, 7)), u"");
+  ASSERT_TRUE(font.setFont(nameless));
   const FontRecord fallback = font.defaultFont();
   ASSERT_NE(font.face(), nullptr);
   const std::string defaultFamily = font.face()->family_name;
