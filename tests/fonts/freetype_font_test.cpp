@@ -9,11 +9,8 @@
 #include FT_FREETYPE_H
 
 #include <algorithm>
-#include <cstdlib>
-#include <cstring>
 #include <filesystem>
 #include <fstream>
-#include <iterator>
 #include <sstream>
 #include <string>
 #include <tuple>
@@ -34,12 +31,14 @@ const char* const kDejaVu = "/usr/share/fonts/truetype/dejavu/DejaVuSans.ttf";
 const char* const kInter = "/usr/share/fonts/truetype/inter-vf/Inter-roman.var.ttf";
 
 FontRecord recordFor(const std::string& path, const std::u16string& postScriptName,
-                     int32_t faceIndex = 0, int32_t instanceId = 0) {
+                     int32_t faceIndex = 0, int32_t instanceId = 0,
+                     const std::u16string& family = u"") {
   FontRecord record;
   record.filePath = std::u16string(path.begin(), path.end());
   record.postScriptName = postScriptName;
   record.faceIndex = faceIndex;
   record.instanceId = instanceId;
+  record.familyName = family;
   return record;
 }
 
@@ -54,9 +53,16 @@ std::string shapedText(HarfBuzzWrapper& wrapper, const std::u32string& text) {
   return out.str();
 }
 
-std::vector<uint8_t> fileBytes(const std::string& path) {
-  std::ifstream file(path, std::ios::binary);
-  return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
+std::string fileBytes(const std::string& path) {
+  std::ostringstream bytes;
+  bytes << std::ifstream(path, std::ios::binary).rdbuf();
+  return bytes.str();
+}
+
+// A copy of `font` with the directory entry of table `table` renamed (its last letter 'q').
+std::string withoutTable(std::string font, const std::string& table) {
+  font[font.find(table, 12) + 3] = 'q';
+  return font;
 }
 
 class FreeTypeFontTest : public testing::Test {
@@ -73,11 +79,9 @@ class FreeTypeFontTest : public testing::Test {
       std::filesystem::remove_all(folder_);
     }
   }
-  std::string write(const std::string& name, const std::vector<uint8_t>& bytes) {
+  std::string write(const std::string& name, const std::string& bytes) {
     const std::string path = folder_ + "/" + name;
-    std::ofstream(path, std::ios::binary)
-        .write(reinterpret_cast<const char*>(bytes.data()),
-               static_cast<std::streamsize>(bytes.size()));
+    std::ofstream(path, std::ios::binary) << bytes;
     return path;
   }
 
@@ -171,47 +175,34 @@ TEST_F(FreeTypeFontTest, AFailedSelectionLeavesNoFontCurrent) {
 }
 
 TEST_F(FreeTypeFontTest, UntrustedFilesFailOrGiveEmptyResults) {
-  const std::vector<uint8_t> dejaVu = fileBytes(kDejaVu);
-  // Without 'cmap' and 'post' (FreeType makes a Unicode map from the glyph names in 'post'):
-  // their directory entries renamed.
-  std::vector<uint8_t> noCmap = dejaVu;
-  for (const char* table : {"cmap", "post"}) {
-    const auto directoryEnd = noCmap.begin() + 12 + 16 * 32;
-    const auto tag = std::search(noCmap.begin(), directoryEnd, table, table + 4);
-    ASSERT_NE(tag, directoryEnd) << table;
-    tag[3] = 'q';
-  }
+  const std::string dejaVu = fileBytes(kDejaVu);
+  // FreeType makes a Unicode map from the glyph names in 'post' when there is no 'cmap'.
+  const std::string noCmap = withoutTable(withoutTable(dejaVu, "cmap"), "post");
   // Only a Microsoft symbol map: the Windows Unicode subtable relabelled (3, 0), every other
   // subtable moved to an unknown platform.
-  std::vector<uint8_t> symbol = dejaVu;
-  const auto cmapEntry =
-      std::search(symbol.begin(), symbol.begin() + 12 + 16 * 32, "cmap", "cmap" + 4);
-  const auto read32 = [](auto at) {
-    return uint32_t{at[0]} << 24 | at[1] << 16 | at[2] << 8 | at[3];
-  };
-  const auto cmap = symbol.begin() + read32(cmapEntry + 8);
-  for (uint16_t i = 0; i < (cmap[2] << 8 | cmap[3]); ++i) {
-    const auto entry = cmap + 4 + 8 * i;
-    const bool windowsUnicode = entry[1] == 3 && entry[3] == 1;
-    entry[1] = windowsUnicode ? 3 : 99;
+  std::string symbol = dejaVu;
+  const auto cmapEntry = reinterpret_cast<const uint8_t*>(&symbol[symbol.find("cmap", 12)]);
+  auto* cmap =
+      reinterpret_cast<uint8_t*>(&symbol[uint32_t{cmapEntry[8]} << 24 | cmapEntry[9] << 16 |
+                                         cmapEntry[10] << 8 | cmapEntry[11]]);
+  for (int i = 0; i < (cmap[2] << 8 | cmap[3]); ++i) {
+    uint8_t* entry = cmap + 4 + 8 * i;
+    entry[1] = entry[1] == 3 && entry[3] == 1 ? 3 : 99;
     entry[3] = 0;
   }
-  const auto cut = [&](size_t size) {
-    return std::vector<uint8_t>(dejaVu.begin(), dejaVu.begin() + static_cast<long>(size));
-  };
   struct Case {
     std::string name;
-    std::vector<uint8_t> bytes;
+    std::string bytes;
     int32_t faceIndex;
     bool selected;
     bool mapped = false;  // whether "A" maps to a glyph
   };
   const Case cases[] = {
-      {"garbage", std::vector<uint8_t>(5000, 0xA5), 0, false},
-      {"header", cut(12), 0, false},
-      {"directory", cut(400), 0, false},
-      {"half", cut(dejaVu.size() / 2), 0, false},
-      {"tail", cut(dejaVu.size() - 2000), 0, true, true},
+      {"garbage", std::string(5000, '\xA5'), 0, false},
+      {"header", dejaVu.substr(0, 12), 0, false},
+      {"directory", dejaVu.substr(0, 400), 0, false},
+      {"half", dejaVu.substr(0, dejaVu.size() / 2), 0, false},
+      {"tail", dejaVu.substr(0, dejaVu.size() - 2000), 0, true, true},
       {"nocmap", noCmap, 0, true},
       {"symbol", symbol, 0, true, true},
       {"past", dejaVu, 5, false},
@@ -237,9 +228,7 @@ TEST_F(FreeTypeFontTest, UntrustedFilesFailOrGiveEmptyResults) {
 }
 
 TEST_F(FreeTypeFontTest, MakesOneUnicodeHelperFromItsFolder) {
-  write("UnicodeData.txt",
-        {'0', '0', '4', '1', ';', 'A', ';', 'L', 'u', ';', '0', ';', 'L', ';', ';',
-         ';', ';', ';', 'N', ';', ';', ';', ';', '0', '0', '6', '1', ';', '\n'});
+  write("UnicodeData.txt", "0041;A;Lu;0;L;;;;;N;;;;0061;\n");
   FreeTypeFont font(nullptr, nullptr, folder_);
   const std::shared_ptr<UnicodeHelper> helper = font.unicodeHelper();
   EXPECT_EQ(font.unicodeHelper(), helper);
@@ -266,19 +255,16 @@ TEST_F(FreeTypeFontTest, FallsBackToThePlatformsDataThenToTheDefaultFont) {
   FreeTypeFont font(std::make_shared<vesk::project::FontCache>(platform::systemServices()),
                     platform::systemServices());
   // A nameless record of a file FreeType cannot open, before the default is chosen.
-  const FontRecord nameless = recordFor(write("nameless.ttf", std::vector<uint8_t>(100, 7)), u"");
+  const FontRecord nameless = recordFor(write("nameless.ttf", std::string(100, 7)), u"");
   ASSERT_TRUE(font.setFont(nameless));
   const FontRecord fallback = font.defaultFont();
   ASSERT_NE(font.face(), nullptr);
   const std::string defaultFamily = font.face()->family_name;
-  FontRecord moved = recordFor(folder_ + "/moved.ttf", u"DejaVuSans");
-  moved.familyName = u"DejaVu Sans";
-  FontRecord unknown = recordFor(write("garbage.ttf", std::vector<uint8_t>(100, 7)), u"Garbage");
-  unknown.familyName = u"No Such Family Anywhere";
-  FontRecord lost = recordFor(folder_ + "/lost.ttf", u"Lost");
-  lost.familyName = unknown.familyName;
+  const std::u16string unknown = u"No Such Family Anywhere";
   const std::tuple<FontRecord, std::string> cases[] = {
-      {moved, "DejaVu Sans"}, {unknown, defaultFamily}, {lost, defaultFamily}};
+      {recordFor(folder_ + "/moved.ttf", u"DejaVuSans", 0, 0, u"DejaVu Sans"), "DejaVu Sans"},
+      {recordFor(write("bad.ttf", std::string(100, 7)), u"Bad", 0, 0, unknown), defaultFamily},
+      {recordFor(folder_ + "/lost.ttf", u"Lost", 0, 0, unknown), defaultFamily}};
   for (const auto& [record, family] : cases) {
     ASSERT_TRUE(font.setFont(record)) << family;
     EXPECT_EQ(font.face()->family_name, family);
