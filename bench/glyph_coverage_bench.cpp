@@ -4,17 +4,14 @@
 // pass a limit, and with --list every glyph past it.
 //   glyph_coverage_bench [--list] [--limit=0.1] [FONT_FILE...]   (default: every TrueType and
 //   OpenType face fontconfig lists)
-#include <fontconfig/fontconfig.h>
-
 #include <cstdio>
 #include <cstdlib>
-#include <set>
 #include <string>
-#include <utility>
 #include <vector>
 
 #include "freetype_face.h"
 #include "glyph_coverage.h"
+#include "listed_outline_faces.h"
 
 namespace {
 
@@ -23,36 +20,10 @@ struct FontFace {
   int index = 0;
 };
 
-// Every TrueType and OpenType face fontconfig lists (named instances of variable fonts are
-// measured at their default instance, once per face).
+// Every TrueType and OpenType face fontconfig lists, a variable face at its default instance.
 std::vector<FontFace> installedFaces() {
-  std::set<std::pair<std::string, int>> seen;
-  FcPattern* pattern = FcPatternCreate();
-  FcObjectSet* objects = FcObjectSetBuild(FC_FILE, FC_INDEX, FC_FONTFORMAT, nullptr);
-  FcConfig* config = FcInitLoadConfigAndFonts();
-  FcFontSet* set = FcFontList(config, pattern, objects);
-  for (int i = 0; set != nullptr && i < set->nfont; ++i) {
-    FcChar8* file = nullptr;
-    FcChar8* format = nullptr;
-    int index = 0;
-    if (FcPatternGetString(set->fonts[i], FC_FILE, 0, &file) != FcResultMatch ||
-        FcPatternGetString(set->fonts[i], FC_FONTFORMAT, 0, &format) != FcResultMatch) {
-      continue;
-    }
-    const std::string kind = reinterpret_cast<const char*>(format);
-    FcPatternGetInteger(set->fonts[i], FC_INDEX, 0, &index);
-    if (kind == "TrueType" || kind == "CFF") {
-      seen.emplace(reinterpret_cast<const char*>(file), index & 0xFFFF);
-    }
-  }
-  if (set != nullptr) {
-    FcFontSetDestroy(set);
-  }
-  FcObjectSetDestroy(objects);
-  FcPatternDestroy(pattern);
-  FcConfigDestroy(config);
   std::vector<FontFace> faces;
-  for (const auto& [path, index] : seen) {
+  for (const auto& [path, index] : waveform_test::listedOutlineFaces()) {
     faces.push_back({path, index});
   }
   return faces;

@@ -2,7 +2,6 @@
 // tests write) and on this machine.
 #include "fonts/font_cache.h"
 
-#include <fontconfig/fontconfig.h>
 #include <gtest/gtest.h>
 
 #include <cstdlib>
@@ -15,6 +14,7 @@
 #include <vector>
 
 #include "ci_or_skip.h"
+#include "listed_outline_faces.h"
 #include "platform/utf16_text.h"
 #include "sfnt_writer.h"
 
@@ -346,28 +346,12 @@ TEST(FontCacheOnThisMachine, EveryDejaVuFaceIsFoundByEachOfItsNames) {
   EXPECT_GE(faces, 6);
 }
 
-// The TrueType and OpenType files (collections included) fontconfig lists on this machine.
+// The files of the TrueType and OpenType faces fontconfig lists.
 std::set<std::string> listedOutlineFiles() {
   std::set<std::string> files;
-  FcPattern* everything = FcPatternCreate();
-  FcObjectSet* objects = FcObjectSetBuild(FC_FILE, FC_FONTFORMAT, nullptr);
-  // A configuration of its own, destroyed afterwards, as the catalogue loads one.
-  FcConfig* config = FcInitLoadConfigAndFonts();
-  FcFontSet* listed = FcFontList(config, everything, objects);
-  for (int i = 0; listed != nullptr && i < listed->nfont; ++i) {
-    FcChar8* file = nullptr;
-    FcChar8* format = nullptr;
-    if (FcPatternGetString(listed->fonts[i], FC_FILE, 0, &file) == FcResultMatch &&
-        FcPatternGetString(listed->fonts[i], FC_FONTFORMAT, 0, &format) == FcResultMatch &&
-        (std::string(reinterpret_cast<char*>(format)) == "TrueType" ||
-         std::string(reinterpret_cast<char*>(format)) == "CFF")) {
-      files.insert(reinterpret_cast<char*>(file));
-    }
+  for (const auto& [file, index] : listedOutlineFaces()) {
+    files.insert(file);
   }
-  FcFontSetDestroy(listed);
-  FcObjectSetDestroy(objects);
-  FcPatternDestroy(everything);
-  FcConfigDestroy(config);
   return files;
 }
 
